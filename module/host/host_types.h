@@ -44,7 +44,7 @@ using GetPropertyProc = int16_t (*)(uint32_t signature, uint32_t key, int32_t in
 using SetPropertyProc = int16_t (*)(uint32_t signature, uint32_t key, int32_t index,
                                     intptr_t simpleValue, HostHandle complexValue);  // 2
 
-// The basic suite, by position.
+// The basic suite, by position (a plain list of pointers, like every suite).
 using AcquireSuiteProc = int32_t (*)(const char* name, int32_t version, const void** suite);  // 1
 using ReleaseSuiteProc = int32_t (*)(const char* name, int32_t version);                      // 2
 

@@ -15,7 +15,7 @@ const void* CRastrixPlugin::Suite(SuiteId id) {
     if (basicSuite_ == nullptr) basicSuite_ = BasicSuite();
     basic = basicSuite_;
   }
-  const auto acquire = TableProc<AcquireSuiteProc>(basic, 1);
+  const auto acquire = SuiteProc<AcquireSuiteProc>(basic, 1);
   if (acquire == nullptr) return nullptr;
   const void* acquired = nullptr;
   if (acquire(suite.name, suite.version, &acquired) == 0) suites_[slot] = acquired;
@@ -32,7 +32,7 @@ void CRastrixPlugin::ReleaseCachedSuites() {
     if (!anyHeld) return;
     basic = BasicSuite();
   }
-  const auto release = TableProc<ReleaseSuiteProc>(basic, 2);
+  const auto release = SuiteProc<ReleaseSuiteProc>(basic, 2);
   for (size_t slot = 0; slot < suites_.size(); ++slot) {
     if (suites_[slot] == nullptr) continue;
     suites_[slot] = nullptr;
