@@ -3,7 +3,6 @@
 #include <algorithm>
 
 #include "core/error.h"
-#include "core/rastrix_error.h"
 #include "host/rastrix_filter.h"
 
 namespace Vireo {
@@ -12,8 +11,7 @@ constexpr uint32_t kFloorCap = 0x80000;  // 512 KiB
 }
 
 bool CRastrixFilter::NegotiateBufferSpace() {
-  if (GetFilterRecord() == nullptr) throw CRastrixError(kParamErr);
-  FilterRecord& record = *GetFilterRecord();
+  FilterRecord& record = AttachedRecord();
   const auto total = static_cast<uint32_t>(record.maxSpace);
   uint32_t first = total >> 1;
   uint32_t second = total - first;

@@ -28,6 +28,11 @@ CRastrixFilter* CRastrixFilter::Current() {
   return g_currentFilter;
 }
 
+FilterRecord& CRastrixFilter::AttachedRecord() const {
+  RequireRecord(filterRecord_);
+  return *filterRecord_;
+}
+
 const BufferProcTable* CRastrixFilter::BufferProcs() const {
   return filterRecord_ != nullptr ? filterRecord_->bufferProcs : nullptr;
 }

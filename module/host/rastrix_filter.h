@@ -65,6 +65,8 @@ class CRastrixFilter : public CRastrixPlugin {
   bool MemoryReady() const { return memoryReady_; }
 
  protected:
+  // The attached filter record; raises the host's parameter error without one.
+  FilterRecord& AttachedRecord() const;
   // The framework's memory set-up itself (tile heap and its allocator).
   void PrepareFrameworkMemory();
 
