@@ -18,7 +18,7 @@ namespace Standin {
 // side: it must stay alive for the duration of Detect.
 struct PageView {
   int32_t width = 0, height = 0;
-  int channels = 0;  // 1 gray or 3 RGB
+  int channels = 0;    // 1 gray or 3 RGB
   bool alpha = false;  // one more plane after the colours
   const uint8_t* pixels = nullptr;
   std::ptrdiff_t rowBytes = 0;
@@ -29,14 +29,15 @@ struct DetectOptions {
 };
 
 struct Detection {
-  std::array<int16_t, 6> selectorResults{};  // parameters, prepare, start, continue, finish (index=selector)
+  std::array<int16_t, 6>
+      selectorResults{};  // parameters, prepare, start, continue, finish (index=selector)
   bool recordPresent = false;
   std::array<int16_t, 9> record{};  // 'fRNG' record values
   bool descriptorPresent = false;
   double angle = 0.0;
   int32_t confidence = 0;
   std::array<int32_t, 8> points{};  // pt1v, pt1h, ... pt4h
-  std::string error;  // empty when the run completed; otherwise what went wrong
+  std::string error;                // empty when the run completed; otherwise what went wrong
 };
 
 // Runs one detection. Problems with the page (no pixels, a side above 32767, an

@@ -22,6 +22,10 @@ class Module {
   // ENTRYPOINT1.
   static std::unique_ptr<Module> Load(const std::string& path, bool privateCopy = false);
 
+  // An entry point linked into this program instead of a module file, so that
+  // the host itself can be tested against a module written for the test.
+  static std::unique_ptr<Module> Wrap(EntryPoint entry, std::string name);
+
   ~Module();
   Module(const Module&) = delete;
   Module& operator=(const Module&) = delete;
