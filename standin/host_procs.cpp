@@ -84,9 +84,8 @@ class ProcImpl {
         host.Note("new handle of negative size " + std::to_string(size));
         return nullptr;
       }
-      std::vector<uint8_t> bytes(static_cast<size_t>(size));
-      bytes.reserve(1);  // a handle of 0 bytes still locks to a non-null address
-      return host.handles_.Create(std::move(bytes), HandleOwner::Module, "new handle");
+      return host.handles_.Create(std::vector<uint8_t>(static_cast<size_t>(size)),
+                                  HandleOwner::Module, "new handle");
     });
   }
   static void DisposeHandle(Abi::Handle handle) { Dispose(Proc::HandleDispose, handle); }
