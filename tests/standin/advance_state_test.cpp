@@ -144,7 +144,7 @@ TEST_F(AdvanceState, UnmeetableRequestsAreRefusedWithoutBuffers) {
 
 TEST_F(AdvanceState, DeliveryHookPlaysABrokenHost) {
   host_.BeginRun();
-  host_.deliveryHook = [](Standin::Delivery& delivery) {
+  host_.deliveryHook = [](Standin::Delivery& delivery, Standin::ByteBlock&) {
     delivery.inData = nullptr;
     delivery.outRowBytes = 1;
   };
