@@ -258,6 +258,18 @@ TEST(GrowQuadTest, MovesAlongTheSidesOfATurnedBox) {
   EXPECT_NEAR(c[2].y, 48 + 0.8 + (0.6 * 2), 1e-12);
 }
 
+TEST(GrowQuadTest, SideStepsComeFromTheTopAndRightSides) {
+  // Not a rectangle: the right side (p2 - p1) is 10 long, the left 5; the
+  // step along it is (p2 - p1) scaled by the left side's length.
+  BoxCorners c = {{{0, 0}, {10, 0}, {10, 10}, {0, 5}}};
+  GrowQuad(c, -1.0, -1.0);
+  const double expected[4][2] = {{1, 2}, {9, 2}, {9, 8}, {1, 3}};
+  for (int k = 0; k < 4; ++k) {
+    EXPECT_EQ(c[k].x, expected[k][0]) << k;
+    EXPECT_EQ(c[k].y, expected[k][1]) << k;
+  }
+}
+
 TEST(GrowQuadTest, DegenerateBoxesStayPut) {
   const BoxCorners boxes[] = {
       {{{5, 5}, {5, 5}, {5, 9}, {5, 9}}},      // zero-length top side
