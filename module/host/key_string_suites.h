@@ -5,6 +5,8 @@
 
 #include <cstdint>
 
+#include "host/suite_procedures.h"
+
 namespace Vireo {
 
 // An opaque translated-string object handed out by the dictionary suite.
@@ -44,15 +46,5 @@ inline constexpr int kSwiftViewTranslatePosition = 17;
 // terminator included.
 using TranslateKeyProc = std::int32_t (*)(const std::uint8_t* lengthPrefixedKey,
                                           std::int32_t capacity, std::uint16_t* buffer);
-
-// A suite as the host hands it out: a list of procedure pointers.
-using SuiteProcedures = const void* const*;
-
-// The procedure at `position` (from 1) of a suite's list, or null.
-template <typename Proc>
-Proc SuiteProcedure(SuiteProcedures suite, int position) {
-  if (suite == nullptr || position < 1) return nullptr;
-  return reinterpret_cast<Proc>(const_cast<void*>(suite[position - 1]));
-}
 
 }  // namespace Vireo
