@@ -29,7 +29,8 @@ void LocalizeString(std::string& text, const KeyStringContext& context) {
 
 void ReplacePlaceholder(std::string& text, int index, std::string value,
                         const KeyStringContext& context) {
-  const std::string token = "^" + std::to_string(index);
+  std::string token = "^";
+  token += std::to_string(index);
   LocalizeString(value, context);
   const std::size_t at = text.find(token);
   if (at != std::string::npos) text.replace(at, token.size(), value);

@@ -4,7 +4,7 @@
 
 #include <cstdint>
 
-#include "host/suite_procedures.h"
+#include "host/proc_table.h"
 
 namespace Vireo {
 

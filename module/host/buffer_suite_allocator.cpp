@@ -4,7 +4,7 @@
 namespace Vireo {
 
 void* CBufferSuiteAllocator::Allocate(std::uint32_t size) {
-  const auto newBuffer = SuiteProcedure<BufferSuiteNewProc>(suite_, kBufferSuiteNewPosition);
+  const auto newBuffer = SuiteProc<BufferSuiteNewProc>(suite_, kBufferSuiteNewPosition);
   if (newBuffer == nullptr) return nullptr;
   std::uint32_t requested = size;
   void* block = newBuffer(&requested, size);
@@ -17,7 +17,7 @@ void* CBufferSuiteAllocator::Allocate(std::uint32_t size) {
 }
 
 void CBufferSuiteAllocator::Free(void* block) {
-  const auto dispose = SuiteProcedure<BufferSuiteDisposeProc>(suite_, kBufferSuiteDisposePosition);
+  const auto dispose = SuiteProc<BufferSuiteDisposeProc>(suite_, kBufferSuiteDisposePosition);
   if (block == nullptr || dispose == nullptr) return;
   dispose(&block);
 }

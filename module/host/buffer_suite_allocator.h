@@ -3,19 +3,19 @@
 #pragma once
 
 #include "host/buffer_suite.h"
-#include "host/virtual_allocator.h"
+#include "host/tile_allocator.h"
 
 namespace Vireo {
 
 class CBufferSuiteAllocator final : public CVirtualAllocator {
  public:
-  explicit CBufferSuiteAllocator(SuiteProcedures suite) : suite_(suite) {}
+  explicit CBufferSuiteAllocator(const void* suite) : suite_(suite) {}
 
   void* Allocate(std::uint32_t size) override;
   void Free(void* block) override;
 
  private:
-  SuiteProcedures suite_;
+  const void* suite_;
 };
 
 }  // namespace Vireo

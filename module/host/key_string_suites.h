@@ -5,8 +5,6 @@
 
 #include <cstdint>
 
-#include "host/suite_procedures.h"
-
 namespace Vireo {
 
 // An opaque translated-string object handed out by the dictionary suite.

@@ -6,6 +6,7 @@
 #include <vector>
 
 #include "core/utf8.h"
+#include "host/proc_table.h"
 
 namespace Vireo {
 namespace {
@@ -18,14 +19,10 @@ std::string TextOfUnits(const std::uint16_t* units, std::int64_t count) {
 
 bool TranslateThroughDictionary(const TranslationSuites& suites, void* pluginReference,
                                 std::string& text) {
-  const auto lookup =
-      SuiteProcedure<DictionaryLookupProc>(suites.dictionary, kDictionaryLookupPosition);
-  const auto release =
-      SuiteProcedure<KeyStringReleaseProc>(suites.keyString, kKeyStringReleasePosition);
-  const auto length =
-      SuiteProcedure<KeyStringLengthProc>(suites.keyString, kKeyStringLengthPosition);
-  const auto get =
-      SuiteProcedure<KeyStringGetUtf16Proc>(suites.keyString, kKeyStringGetUtf16Position);
+  const auto lookup = SuiteProc<DictionaryLookupProc>(suites.dictionary, kDictionaryLookupPosition);
+  const auto release = SuiteProc<KeyStringReleaseProc>(suites.keyString, kKeyStringReleasePosition);
+  const auto length = SuiteProc<KeyStringLengthProc>(suites.keyString, kKeyStringLengthPosition);
+  const auto get = SuiteProc<KeyStringGetUtf16Proc>(suites.keyString, kKeyStringGetUtf16Position);
   if (lookup == nullptr || release == nullptr || length == nullptr || get == nullptr) return false;
 
   HostKeyString object = nullptr;
@@ -66,12 +63,12 @@ bool TranslateThroughSuites(const TranslationSuites& suites, void* pluginReferen
     return TranslateThroughDictionary(suites, pluginReference, text);
   }
   if (const auto translate =
-          SuiteProcedure<TranslateKeyProc>(suites.utilities, kUtilitiesTranslatePosition)) {
+          SuiteProc<TranslateKeyProc>(suites.utilities, kUtilitiesTranslatePosition)) {
     TranslateThroughProcedure(translate, text);
     return true;
   }
   if (const auto translate =
-          SuiteProcedure<TranslateKeyProc>(suites.swiftView, kSwiftViewTranslatePosition)) {
+          SuiteProc<TranslateKeyProc>(suites.swiftView, kSwiftViewTranslatePosition)) {
     TranslateThroughProcedure(translate, text);
     return true;
   }

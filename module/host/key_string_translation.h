@@ -15,10 +15,10 @@ inline constexpr std::uint32_t kMaxKeyStringUnits = 65536;
 inline constexpr std::int32_t kTranslationBufferUnits = 4096;
 
 struct TranslationSuites {
-  SuiteProcedures keyString = nullptr;
-  SuiteProcedures dictionary = nullptr;
-  SuiteProcedures utilities = nullptr;
-  SuiteProcedures swiftView = nullptr;
+  const void* keyString = nullptr;
+  const void* dictionary = nullptr;
+  const void* utilities = nullptr;
+  const void* swiftView = nullptr;
 };
 
 // Tries the dictionary and KeyString suites together, else the utilities
