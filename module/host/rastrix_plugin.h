@@ -47,6 +47,8 @@ class CRastrixPlugin : public CProcess {
   // Suites: acquired on first request and cached; a failed acquisition is
   // tried again at the next request.
   const void* Suite(SuiteId id);
+  // The cached suite pointer, without trying to acquire it.
+  const void* CachedSuite(SuiteId id) const { return suites_.at(static_cast<size_t>(id)); }
 
   // Host properties.
   bool HasPropertyProcs() const;
