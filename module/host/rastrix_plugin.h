@@ -8,6 +8,7 @@
 #include <cstdint>
 
 #include "core/process.h"
+#include "host/buffer_procs.h"
 #include "host/filter_record.h"
 #include "host/host_types.h"
 #include "host/suite_catalog.h"
@@ -67,6 +68,15 @@ class CRastrixPlugin : public CProcess {
   // The host's start flag ('zScW'), kept for the windowing toolkit.
   bool HostStartFlag() const { return hostStartFlag_; }
   void ReadHostStartFlag();
+
+  // Host buffers. Allocation raises the host's code, or -108 when no buffer
+  // came back or the procedure is missing.
+  bool HasBufferProcs() const;
+  HostBufferId AllocateHostBuffer(int32_t size);
+  void* LockHostBuffer(HostBufferId id, bool moveHigh);
+  void UnlockHostBuffer(HostBufferId id);
+  void FreeHostBuffer(HostBufferId id);
+  int32_t GetHostBufferSpace();
 
   // Host handles.
   bool HasHandleProcs() const;

@@ -1,0 +1,66 @@
+// The host's scratch volumes, read through its property procedures.
+#include "host/scratch_volumes.h"
+
+#include <algorithm>
+#include <cstring>
+
+#include "host/four_char_code.h"
+#include "host/rastrix_plugin.h"
+
+namespace Vireo {
+namespace {
+
+constexpr uint32_t kVolumeCountKey = FourCharCode("nusv");
+constexpr uint32_t kVolumePathKey = FourCharCode("svlp");
+
+// The NUL-terminated wide text of a locked handle of `bytes` bytes; stops at
+// the handle's end when the terminator is missing.
+std::u16string WideTextOf(const void* data, int32_t bytes) {
+  std::u16string text;
+  const auto* cursor = static_cast<const unsigned char*>(data);
+  for (int32_t offset = 0; offset + 1 < bytes; offset += 2) {
+    char16_t unit = 0;
+    std::memcpy(&unit, cursor + offset, sizeof unit);  // the host may not align it
+    if (unit == 0) break;
+    text.push_back(unit);
+  }
+  return text;
+}
+
+std::u16string ReadVolumePath(CRastrixPlugin& plugin, HostHandle handle) {
+  const int32_t bytes = plugin.GetHostHandleSize(handle);
+  if (bytes <= 0) return {};
+  const void* data = plugin.LockHostHandle(handle, false);
+  std::u16string path;
+  if (data != nullptr) path = WideTextOf(data, bytes);
+  plugin.UnlockHostHandle(handle);
+  return path;
+}
+
+}  // namespace
+
+std::vector<std::u16string> ReadScratchVolumes(CRastrixPlugin& plugin) {
+  std::vector<std::u16string> volumes;
+  intptr_t count = 0;
+  if (!plugin.GetHostProperty(kHostPropertySignature, kVolumeCountKey, 0, count)) return volumes;
+  count = std::clamp<intptr_t>(count, 0, kMaxScratchVolumes);
+  for (int32_t index = 0; index < count; ++index) {
+    HostHandle handle = nullptr;
+    if (!plugin.GetHostPropertyHandle(kHostPropertySignature, kVolumePathKey, index, handle) ||
+        handle == nullptr) {
+      continue;
+    }
+    std::u16string path;
+    try {
+      path = ReadVolumePath(plugin, handle);
+    } catch (...) {
+      plugin.DisposeHostHandle(handle);
+      throw;
+    }
+    plugin.DisposeHostHandle(handle);
+    if (!path.empty()) volumes.push_back(std::move(path));
+  }
+  return volumes;
+}
+
+}  // namespace Vireo
