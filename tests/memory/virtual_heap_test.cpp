@@ -52,11 +52,15 @@ class CountingAllocator final : public CVirtualAllocator {
 
 class VirtualHeapTest : public ::testing::Test {
  protected:
+  // Removed while the counts it writes to still exist.
   void TearDown() override { InstallTileAllocator(nullptr); }
+
+  CountingAllocator::Counts counts;
+  CountingAllocator::Counts first;
+  CountingAllocator::Counts second;
 };
 
 TEST_F(VirtualHeapTest, TakesTilesFromTheInstalledAllocatorAndGivesThemBack) {
-  CountingAllocator::Counts counts;
   InstallTileAllocator(new CountingAllocator(counts));
   {
     CVirtualHeap heap;
@@ -84,7 +88,6 @@ TEST_F(VirtualHeapTest, UsesTheProcessHeapWithoutAnAllocator) {
 }
 
 TEST_F(VirtualHeapTest, AFailingAllocatorRaisesOutOfMemoryWithoutFallingBack) {
-  CountingAllocator::Counts counts;
   InstallTileAllocator(new CountingAllocator(counts, true));
   CVirtualHeap heap;
   heap.SetTileBudget(32 * kMiB);
@@ -101,8 +104,8 @@ TEST_F(VirtualHeapTest, AFailingAllocatorRaisesOutOfMemoryWithoutFallingBack) {
 TEST_F(VirtualHeapTest, RefusesATileBeyondTheBudget) {
   CVirtualHeap heap;
   heap.SetTileBudget(32 * kMiB);
-  void* first = heap.AcquireTile(CVirtualHeap::kMaxSizeClass);  // 16 MiB
-  void* second = heap.AcquireTile(CVirtualHeap::kMaxSizeClass);
+  void* one = heap.AcquireTile(CVirtualHeap::kMaxSizeClass);  // 16 MiB
+  void* two = heap.AcquireTile(CVirtualHeap::kMaxSizeClass);
   try {
     heap.AcquireTile(0);
     FAIL() << "no error";
@@ -117,12 +120,11 @@ TEST_F(VirtualHeapTest, RefusesATileBeyondTheBudget) {
     EXPECT_FALSE(error.IsSilent());
     EXPECT_TRUE(error.ShowsAlert());
   }
-  heap.ReleaseTile(first);
-  heap.ReleaseTile(second);
+  heap.ReleaseTile(one);
+  heap.ReleaseTile(two);
 }
 
 TEST_F(VirtualHeapTest, ReusesSpareTilesAndGivesUpTheExcessWhenTheBudgetShrinks) {
-  CountingAllocator::Counts counts;
   InstallTileAllocator(new CountingAllocator(counts));
   CVirtualHeap heap;
   heap.SetTileBudget(64 * kMiB);
@@ -141,8 +143,6 @@ TEST_F(VirtualHeapTest, ReusesSpareTilesAndGivesUpTheExcessWhenTheBudgetShrinks)
 }
 
 TEST_F(VirtualHeapTest, GivesATileBackToItsOwnAllocatorAfterTheSlotMovedOn) {
-  CountingAllocator::Counts first;
-  CountingAllocator::Counts second;
   InstallTileAllocator(new CountingAllocator(first));
   CVirtualHeap heap;
   heap.SetTileBudget(32 * kMiB);
