@@ -5,6 +5,7 @@
 #include <cstdlib>
 #include <filesystem>
 #include <fstream>
+#include <random>
 #include <stdexcept>
 
 namespace HostFake {
@@ -28,8 +29,10 @@ int g_counter = 0;
 
 ScopedAlertLog::ScopedAlertLog() {
   const auto directory = std::filesystem::temp_directory_path();
-  path_ = (directory / ("fringe-alerts-" + std::to_string(++g_counter) + "-" +
-                        std::to_string(reinterpret_cast<std::uintptr_t>(this)) + ".log"))
+  // Tests run side by side in separate processes: the name must not collide.
+  std::random_device entropy;
+  path_ = (directory / ("fringe-alerts-" + std::to_string(entropy()) + "-" +
+                        std::to_string(++g_counter) + ".log"))
               .string();
   std::remove(path_.c_str());
   SetVariable("FRINGE_ALERT_LOG", path_);
