@@ -12,9 +12,13 @@ ByteReader::ByteReader(const Bytes& bytes, std::size_t start, std::size_t end)
 
 void ByteReader::Need(std::size_t count) const {
   if (count > end_ - position_) {
-    throw std::out_of_range("read of " + std::to_string(count) + " bytes at " +
-                            std::to_string(position_) + " passes the end at " +
-                            std::to_string(end_));
+    std::string message = "read of ";
+    message += std::to_string(count);
+    message += " bytes at ";
+    message += std::to_string(position_);
+    message += " passes the end at ";
+    message += std::to_string(end_);
+    throw std::out_of_range(message);
   }
 }
 

@@ -187,7 +187,7 @@ TEST_F(ModuleResources, StringTableHoldsQuotedTextsUnderTheListedIdentifiers) {
 
   EXPECT_EQ(texts[2], "\"Fringe Scan\"");
   for (const auto& [id, text] : texts) {
-    SCOPED_TRACE("string " + std::to_string(id));
+    SCOPED_TRACE(testing::Message() << "string " << id);
     ASSERT_GE(text.size(), 3U);
     EXPECT_EQ(text.front(), '"');
     EXPECT_EQ(text.back(), '"');

@@ -114,7 +114,10 @@ class ResourceWalker {
 }  // namespace
 
 std::string ResourceKey::ToString() const {
-  return isName ? name : "#" + std::to_string(id);
+  if (isName) return name;
+  std::string text = "#";
+  text += std::to_string(id);
+  return text;
 }
 
 std::vector<Resource> ReadPeResources(const Bytes& file) {
