@@ -15,11 +15,12 @@ constexpr uint32_t kVolumePathKey = FourCharCode("svlp");
 
 // The NUL-terminated wide text of a locked handle of `bytes` bytes; stops at
 // the handle's end when the terminator is missing.
-std::u16string WideTextOf(const void* data, int32_t bytes) {
-  std::u16string text;
+std::wstring WideTextOf(const void* data, int32_t bytes) {
+  std::wstring text;
   const auto* cursor = static_cast<const unsigned char*>(data);
-  for (int32_t offset = 0; offset + 1 < bytes; offset += 2) {
-    char16_t unit = 0;
+  constexpr int32_t kUnit = sizeof(wchar_t);
+  for (int32_t offset = 0; offset + kUnit <= bytes; offset += kUnit) {
+    wchar_t unit = 0;
     std::memcpy(&unit, cursor + offset, sizeof unit);  // the host may not align it
     if (unit == 0) break;
     text.push_back(unit);
@@ -27,11 +28,11 @@ std::u16string WideTextOf(const void* data, int32_t bytes) {
   return text;
 }
 
-std::u16string ReadVolumePath(CRastrixPlugin& plugin, HostHandle handle) {
+std::wstring ReadVolumePath(CRastrixPlugin& plugin, HostHandle handle) {
   const int32_t bytes = plugin.GetHostHandleSize(handle);
   if (bytes <= 0) return {};
   const void* data = plugin.LockHostHandle(handle, false);
-  std::u16string path;
+  std::wstring path;
   if (data != nullptr) path = WideTextOf(data, bytes);
   plugin.UnlockHostHandle(handle);
   return path;
@@ -39,8 +40,8 @@ std::u16string ReadVolumePath(CRastrixPlugin& plugin, HostHandle handle) {
 
 }  // namespace
 
-std::vector<std::u16string> ReadScratchVolumes(CRastrixPlugin& plugin) {
-  std::vector<std::u16string> volumes;
+std::vector<std::wstring> ReadScratchVolumes(CRastrixPlugin& plugin) {
+  std::vector<std::wstring> volumes;
   intptr_t count = 0;
   if (!plugin.GetHostProperty(kHostPropertySignature, kVolumeCountKey, 0, count)) return volumes;
   count = std::clamp<intptr_t>(count, 0, kMaxScratchVolumes);
@@ -50,7 +51,7 @@ std::vector<std::u16string> ReadScratchVolumes(CRastrixPlugin& plugin) {
         handle == nullptr) {
       continue;
     }
-    std::u16string path;
+    std::wstring path;
     try {
       path = ReadVolumePath(plugin, handle);
     } catch (...) {

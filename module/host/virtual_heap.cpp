@@ -70,7 +70,7 @@ void CVirtualHeap::SetTileBudget(std::uint64_t bytes) {
   TrimSpares(budget_);
 }
 
-void CVirtualHeap::SetUpBackingStorage(std::vector<std::u16string> volumes) {
+void CVirtualHeap::SetUpBackingStorage(std::vector<std::wstring> volumes) {
   volumes_ = std::move(volumes);
   hasBackingStorage_ = true;
 }

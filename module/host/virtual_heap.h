@@ -44,9 +44,9 @@ class CVirtualHeap {
   std::size_t SpareTiles() const { return spare_.size(); }
 
   bool HasBackingStorage() const { return hasBackingStorage_; }
-  // Takes the scratch volumes (UTF-16 paths; possibly none) as backing storage.
-  void SetUpBackingStorage(std::vector<std::u16string> volumes);
-  const std::vector<std::u16string>& ScratchVolumes() const { return volumes_; }
+  // Takes the scratch volumes (paths; possibly none) as backing storage.
+  void SetUpBackingStorage(std::vector<std::wstring> volumes);
+  const std::vector<std::wstring>& ScratchVolumes() const { return volumes_; }
 
  private:
   struct Block {
@@ -64,7 +64,7 @@ class CVirtualHeap {
   std::unordered_map<void*, Block> inUse_;
   std::vector<Block> spare_;
   bool hasBackingStorage_ = false;
-  std::vector<std::u16string> volumes_;
+  std::vector<std::wstring> volumes_;
 };
 
 }  // namespace Vireo

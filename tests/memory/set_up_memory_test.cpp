@@ -24,14 +24,16 @@ constexpr std::uint64_t kMiB = 1024 * 1024;
 constexpr std::uint64_t kGiB = 1024 * kMiB;
 const std::string kBufferSuite = "Rastrix Buffer Suite for Plug-ins/1";
 
-// UTF-16 bytes of an ASCII path, little-endian, with or without a terminator.
+// The bytes of an ASCII path in the platform's wide characters, with or
+// without a terminator.
 std::vector<unsigned char> WidePath(const std::string& path, bool terminated = true) {
   std::vector<unsigned char> bytes;
-  for (const char c : path) {
-    bytes.push_back(static_cast<unsigned char>(c));
-    bytes.push_back(0);
-  }
-  if (terminated) bytes.insert(bytes.end(), {0, 0});
+  auto append = [&bytes](wchar_t unit) {
+    const auto* first = reinterpret_cast<const unsigned char*>(&unit);
+    bytes.insert(bytes.end(), first, first + sizeof unit);
+  };
+  for (const char c : path) append(static_cast<wchar_t>(c));
+  if (terminated) append(0);
   return bytes;
 }
 
@@ -131,7 +133,7 @@ TEST_F(SetUpMemoryTest, HandsTheScratchVolumesToTheHeapAndEveryHandleBack) {
   CRastrixFilter filter(0);
   const CVirtualHeap& heap = SetUpWithSpace(filter, 100 * kMiB);
   ASSERT_TRUE(heap.HasBackingStorage());
-  EXPECT_EQ(heap.ScratchVolumes(), (std::vector<std::u16string>{u"C:\\Scratch", u"D:\\"}));
+  EXPECT_EQ(heap.ScratchVolumes(), (std::vector<std::wstring>{L"C:\\Scratch", L"D:\\"}));
   EXPECT_EQ(host.LiveHandles(), 0U);
   EXPECT_EQ(host.LockedHandles(), 0);
 }
@@ -164,16 +166,18 @@ TEST_F(SetUpMemoryTest, ReadsAHugeCountAsAtMostSixtyFourVolumes) {
 
 TEST_F(SetUpMemoryTest, SkipsEmptyUnlockableAndMissingVolumesAndBoundsAnUnterminatedOne) {
   host.volumeCount = 5;
+  std::vector<unsigned char> unterminated = WidePath("G:\\Open", false);
+  unterminated.push_back('Z');  // and a stray byte short of a whole character
   host.volumeHandles = {
-      {},                              // empty handle
-      WidePath("F:\\Locked"),          // lock fails
-      WidePath("G:\\Open", false),     // no terminator
-      {'H', 0, ':', 0, 0, 0, 'X', 0},  // text ends at the first terminator
-  };                                   // index 4: the host has none
+      {},                                 // empty handle
+      WidePath("F:\\Locked"),             // lock fails
+      unterminated,                       // read up to the handle's end, no further
+      WidePath(std::string("H:\0X", 4)),  // text ends at the first terminator
+  };                                      // index 4: the host has none
   host.unlockableHandles = {1};
   CRastrixFilter filter(0);
   const CVirtualHeap& heap = SetUpWithSpace(filter, 100 * kMiB);
-  EXPECT_EQ(heap.ScratchVolumes(), (std::vector<std::u16string>{u"G:\\Open", u"H:"}));
+  EXPECT_EQ(heap.ScratchVolumes(), (std::vector<std::wstring>{L"G:\\Open", L"H:"}));
   EXPECT_EQ(host.LiveHandles(), 0U);
   EXPECT_EQ(host.LockedHandles(), 0);
 }
