@@ -112,10 +112,11 @@ TEST_F(PluginTranslationTest, ARunAsksTheHostAtMostOncePerKey) {
     LocalizeString(title);
     EXPECT_EQ(title.Utf8(), "Fehler");
   }
-  CText unknown = "$$$/Vireo/Unknown=Default";
-  LocalizeString(unknown);
-  LocalizeString(unknown = "$$$/Vireo/Unknown=Default");
-  EXPECT_EQ(unknown.Utf8(), "");  // the host answered: its empty text stands
+  for (int i = 0; i < 2; ++i) {
+    CText unknown = "$$$/Vireo/Unknown=Default";
+    LocalizeString(unknown);
+    EXPECT_EQ(unknown.Utf8(), "");  // the host answered: its empty text stands
+  }
   EXPECT_EQ(g_translateCalls, 2);
 
   ReleaseServices();  // the run is over: the next one asks again
