@@ -11,8 +11,6 @@
 #include <set>
 #include <utility>
 
-#include <vips/vips8>
-
 namespace Fringe {
 
 namespace {
@@ -24,18 +22,13 @@ std::string Lower(std::string s) {
   return s;
 }
 
+// Raster formats that scans come in. libvips also reads tables, matrices and
+// documents, which a folder of scans holds for other reasons; such a file is
+// still read when named on the command line.
 const std::set<std::string>& ImageSuffixes() {
-  static const std::set<std::string> suffixes = [] {
-    std::set<std::string> s;
-    if (gchar** list = vips_foreign_get_suffixes()) {
-      for (gchar** p = list; *p != nullptr; ++p) {
-        s.insert(Lower(*p));
-        g_free(*p);
-      }
-      g_free(static_cast<gpointer>(list));
-    }
-    return s;
-  }();
+  static const std::set<std::string> suffixes = {
+      ".png", ".jpg", ".jpeg", ".jpe", ".jfif", ".tif", ".tiff", ".webp", ".gif",  ".bmp",
+      ".pbm", ".pgm", ".ppm",  ".pnm", ".jp2",  ".j2k", ".jxl",  ".heic", ".heif", ".avif"};
   return suffixes;
 }
 

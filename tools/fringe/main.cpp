@@ -18,6 +18,11 @@ void SetUpVips(const char* argv0, bool worker) {
     std::fprintf(stderr, "fringe: cannot start libvips\n");
     std::exit(Fringe::kExitInternal);
   }
+  // Decoders report through libvips' error buffer, which fringe turns into
+  // one error line per file; their warnings would only repeat it.
+  g_log_set_handler(
+      "VIPS", G_LOG_LEVEL_WARNING, [](const gchar*, GLogLevelFlags, const gchar*, gpointer) {},
+      nullptr);
   // Loaders that libvips itself does not trust with hostile files stay off.
   vips_block_untrusted_set(TRUE);
   // Each page is decoded once and used at once: caching would only hold memory.

@@ -45,9 +45,13 @@ Standin::PageView ViewOf(const vips::VImage& image, int channels, bool alpha) {
   return v;
 }
 
-// Maps a pixel of the detected copy back onto the page, centre to centre.
-int32_t ScaleBack(int32_t v, double ratio) {
-  return static_cast<int32_t>(std::lround((v + 0.5) * ratio - 0.5));
+// Maps a pixel of the detected copy back onto the page so that the first and
+// last pixels of the copy land on the first and last of the page: the module's
+// whole-page answer stays the whole page.
+int32_t ScaleBack(int32_t v, int32_t copySide, int32_t pageSide) {
+  if (copySide <= 1) return v;
+  return static_cast<int32_t>(
+      std::lround(static_cast<double>(v) * (pageSide - 1) / (copySide - 1)));
 }
 
 }  // namespace
@@ -74,9 +78,9 @@ ModuleAnswer PhotoDetector::Detect(const DecodedPage& page, int32_t maxSide) {
     throw PageError(ErrorKind::Internal, std::string("cannot downscale page: ") + e.what());
   }
   ModuleAnswer a = AnswerFrom(Standin::Detect(*module_, ViewOf(small, page.channels, page.alpha)));
-  const double rx = static_cast<double>(page.width) / small.width();
-  const double ry = static_cast<double>(page.height) / small.height();
-  for (Corner& c : a.corners) c = {ScaleBack(c.x, rx), ScaleBack(c.y, ry)};
+  for (Corner& c : a.corners) {
+    c = {ScaleBack(c.x, small.width(), page.width), ScaleBack(c.y, small.height(), page.height)};
+  }
   a.detectScale = static_cast<double>(small.width()) / page.width;
   return a;
 }
