@@ -24,7 +24,7 @@ void DrawThickLine(const vips::VImage& mask, Corner a, Corner b, int thickness) 
 }  // namespace
 
 vips::VImage OutlinePicture(const DecodedPage& page, const ModuleAnswer& answer) {
-  const int thickness = std::max(2, static_cast<int>(std::min(page.width, page.height) / 400));
+  const int thickness = std::max(2, static_cast<int>(std::min(page.width, page.height) / 300));
   vips::VImage mask = vips::VImage::black(page.width, page.height).copy_memory();
   for (int k = 0; k < 4; ++k) {
     DrawThickLine(mask, answer.corners[k], answer.corners[(k + 1) % 4], thickness);
