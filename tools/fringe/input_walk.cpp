@@ -69,7 +69,7 @@ class Walker {
       return;
     }
     // A file named on the command line is tried whatever its name says.
-    Page(arg, BaseName(arg));
+    Page(arg, arg);
   }
 
  private:

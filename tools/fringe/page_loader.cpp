@@ -46,6 +46,17 @@ std::string LoaderFamily(const char* loader) {
   return name;
 }
 
+// Loaders that libvips marks untrusted are blocked; a file that only such a
+// loader claims is, for fringe, not an image (often a damaged one).
+bool IsBlockedLoader(const char* loader) {
+  const GType type = vips_type_find("VipsOperation", loader);
+  if (type == 0) return false;
+  auto* klass = static_cast<VipsOperationClass*>(g_type_class_ref(type));
+  const bool blocked = (klass->flags & (VIPS_OPERATION_UNTRUSTED | VIPS_OPERATION_BLOCKED)) != 0;
+  g_type_class_unref(klass);
+  return blocked;
+}
+
 bool NeedsColourConversion(VipsInterpretation i) {
   switch (i) {
     case VIPS_INTERPRETATION_CMYK:
@@ -102,9 +113,9 @@ std::ptrdiff_t DecodedPage::RowBytes() const {
 DecodedPage LoadPage(const std::string& path, const LoadLimits& limits) {
   CheckFile(path);
   const char* loader = vips_foreign_find_load(path.c_str());
-  if (loader == nullptr) {
+  if (loader == nullptr || IsBlockedLoader(loader)) {
     vips_error_clear();
-    Refuse("not an image format that libvips can read");
+    Refuse("not an image format that libvips can read, or damaged beyond recognition");
   }
   DecodedPage page;
   page.format = LoaderFamily(loader);
