@@ -78,9 +78,9 @@ void AddCommon(CLI::App* sub, Options& o) {
 void AddWriting(CLI::App* sub, Options& o, bool outline, bool photo) {
   sub->add_option("-o,--output", o.page.outputDir, "Folder for the written files")->required();
   if (outline) {
-    sub->add_option("--outline-format", o.page.outlineFormat, "png or jpg")
+    sub->add_option("--outline-format", o.page.outlineFormat, "jpg or png")
         ->capture_default_str()
-        ->check(CLI::IsMember({"png", "jpg"}));
+        ->check(CLI::IsMember({"jpg", "png"}));
   }
   if (photo) {
     sub->add_option("--format", o.page.photoFormat,

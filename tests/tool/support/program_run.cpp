@@ -35,6 +35,9 @@ std::string FringeProgram() {
 std::string FringeModule() {
   return FRINGE_TEST_MODULE;
 }
+std::string CrashingModule() {
+  return FRINGE_TEST_CRASHING_MODULE;
+}
 
 std::vector<nlohmann::json> RunOutcome::JsonLines() const {
   std::vector<nlohmann::json> lines;

@@ -23,6 +23,8 @@ struct RunOutcome {
 // The fringe program and module under test (set by the build).
 std::string FringeProgram();
 std::string FringeModule();
+// A module file that aborts on pages of odd width and publishes nothing on others.
+std::string CrashingModule();
 
 // Runs fringe with args in folder cwd (empty: the current one).
 RunOutcome RunFringe(const std::vector<std::string>& args, const std::string& cwd = "");
