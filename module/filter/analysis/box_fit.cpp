@@ -46,29 +46,6 @@ double LargestEntry(const double* values, int32_t length) {
   return largest;
 }
 
-// The occupancy edges: the first and last cell within 1.0 of half the
-// largest smoothed value, with the fallbacks cell 0 and the last cell.
-Sides OccupancyEdges(const double* occupancy, int32_t cells, double origin) {
-  const double half = LargestEntry(occupancy, cells) * 0.5;
-  const auto near = [&](int32_t k) { return std::abs(occupancy[k] - half) <= 1.0; };
-  int32_t first = 0;
-  for (int32_t k = 0; k < cells; ++k) {
-    if (near(k)) {
-      first = k;
-      break;
-    }
-  }
-  int32_t last = -1;
-  for (int32_t k = cells - 1; k >= 0; --k) {
-    if (near(k)) {
-      last = k;
-      break;
-    }
-  }
-  if (last < 1) last = cells - 1;
-  return {static_cast<double>(first) + origin, static_cast<double>(last) + origin};
-}
-
 // Finds the two sides of one axis from the coordinates of the points.
 bool FitAxis(const DoubleList& list, int32_t n, const AnalysisParams& params, Sides& sides) {
   double lowest = list.data[0];
@@ -99,7 +76,8 @@ bool FitAxis(const DoubleList& list, int32_t n, const AnalysisParams& params, Si
       static_cast<int16_t>(TruncToInt32(LargestEntry(axis.copy.get(), axis.cells))) / 2);
   if (window > margin) window = margin;
   WindowSum(axis.occupancy.get(), axis.scratch.get(), axis.cells, window);
-  const Sides occupied = OccupancyEdges(axis.occupancy.get(), axis.cells, origin);
+  Sides occupied;
+  OccupancyEdges(axis.occupancy.get(), axis.cells, origin, occupied.low, occupied.high);
 
   // The count edges: cells holding at least minCount points.
   int32_t first = -1;
@@ -158,6 +136,29 @@ void WindowSum(double* values, double* scratch, int32_t length, int32_t window) 
     for (int32_t j = i - half; j <= i + tail; ++j) sum += scratch[j];
     values[i] = sum;
   }
+}
+
+void OccupancyEdges(const double* occupancy, int32_t cells, double origin, double& nearEdge,
+                    double& farEdge) {
+  const double half = LargestEntry(occupancy, cells) * 0.5;
+  const auto crosses = [&](int32_t k) { return std::abs(occupancy[k] - half) <= 1.0; };
+  int32_t first = 0;
+  for (int32_t k = 0; k < cells; ++k) {
+    if (crosses(k)) {
+      first = k;
+      break;
+    }
+  }
+  int32_t last = -1;
+  for (int32_t k = cells - 1; k >= 0; --k) {
+    if (crosses(k)) {
+      last = k;
+      break;
+    }
+  }
+  if (last < 1) last = cells - 1;
+  nearEdge = static_cast<double>(first) + origin;
+  farEdge = static_cast<double>(last) + origin;
 }
 
 bool FitBox(const DoubleList& xs, const DoubleList& ys, BoxCorners& corners,

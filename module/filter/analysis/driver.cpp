@@ -30,12 +30,6 @@ constexpr int16_t kNoConfidence = 0;
 constexpr int16_t kWholePageConfidence = 127;
 constexpr int16_t kFoundConfidence = 255;
 
-AnalysisParams MakeParams(int16_t width, int16_t height) {
-  AnalysisParams params;
-  params.minCount = TruncToInt32(static_cast<double>(std::min(width, height)) * 0.15);
-  return params;
-}
-
 // The second half: outline points, angle, upright box, corners turned back
 // and rounded into the result. False when a stage fails.
 bool FindPhotoCorners(const FrameView& frame, AnalysisHost& host, Rect search, const Rect& image,
@@ -58,10 +52,16 @@ bool FindPhotoCorners(const FrameView& frame, AnalysisHost& host, Rect search, c
 
 }  // namespace
 
+AnalysisParams MakeAnalysisParams(int16_t width, int16_t height) {
+  AnalysisParams params;
+  params.minCount = TruncToInt32(static_cast<double>(std::min(width, height)) * 0.15);
+  return params;
+}
+
 void RunAnalysis(const FrameView& frame, AnalysisHost& host, AnalysisResult& result) {
   const int16_t width = FrameWidth(frame);
   const int16_t height = FrameHeight(frame);
-  const AnalysisParams params = MakeParams(width, height);
+  const AnalysisParams params = MakeAnalysisParams(width, height);
   if (width < kMinFrameSide || height < kMinFrameSide) {
     host.WriteEmptyFringeRecord();
     return;
