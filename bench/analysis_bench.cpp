@@ -11,6 +11,8 @@
 #include <string>
 #include <vector>
 
+#include <unistd.h>
+
 #include "bench_pages.h"
 #include "filter/analysis/angle.h"
 #include "filter/analysis/box_fit.h"
@@ -156,6 +158,9 @@ void Chain(benchmark::State& state, BenchPage& page) {
 // Prints the usual table, then every figure as a multiple of the floor.
 class FloorRatioReporter : public benchmark::ConsoleReporter {
  public:
+  // Colours only on a terminal, so that a saved run reads as plain text.
+  explicit FloorRatioReporter(bool color) : ConsoleReporter(color ? OO_Color : OO_None) {}
+
   void ReportRuns(const std::vector<Run>& runs) override {
     ConsoleReporter::ReportRuns(runs);
     for (const Run& run : runs) {
@@ -223,7 +228,7 @@ int main(int argc, char** argv) {
   benchmark::Initialize(&argc, argv);
   if (benchmark::ReportUnrecognizedArguments(argc, argv)) return 1;
   Register();
-  FloorRatioReporter reporter;
+  FloorRatioReporter reporter(isatty(fileno(stdout)) != 0);
   benchmark::RunSpecifiedBenchmarks(&reporter);
   benchmark::Shutdown();
   return 0;

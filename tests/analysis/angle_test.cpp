@@ -91,6 +91,31 @@ TEST(LocalDirectionTest, CoincidentPointsAndOneColumnDoNotFail) {
   EXPECT_TRUE(a == 0.0 || std::abs(std::abs(a) - 90.0) < 1e-6) << a;
 }
 
+TEST(VoteTest, FoldingKeepsPlusAndMinusFortyFiveApart) {
+  EXPECT_EQ(FoldToQuarterTurn(45.0), 45.0);
+  EXPECT_EQ(FoldToQuarterTurn(-45.0), -45.0);
+  EXPECT_EQ(FoldToQuarterTurn(135.0), -45.0);  // 135 - 180
+  EXPECT_EQ(FoldToQuarterTurn(-135.0), 45.0);  // -135 + 180
+  EXPECT_EQ(FoldToQuarterTurn(90.0), 0.0);     // not above 90: 90 - 90
+  EXPECT_EQ(FoldToQuarterTurn(-90.0), 0.0);
+  EXPECT_EQ(FoldToQuarterTurn(100.0), 10.0);
+  EXPECT_EQ(FoldToQuarterTurn(-170.0), 10.0);
+  EXPECT_EQ(FoldToQuarterTurn(60.0), -30.0);
+  EXPECT_EQ(FoldToQuarterTurn(179.5), -0.5);
+}
+
+TEST(VoteTest, BinsRoundToTheNearestHalfDegree) {
+  EXPECT_EQ(VoteBin(45.0, 180), 180);  // no such bin: dropped
+  EXPECT_EQ(VoteBin(44.75, 180), 180);
+  EXPECT_EQ(VoteBin(44.7499, 180), 179);
+  EXPECT_EQ(VoteBin(-45.0, 180), 0);
+  EXPECT_EQ(VoteBin(-44.75, 180), 1);
+  EXPECT_EQ(VoteBin(0.0, 180), 90);
+  EXPECT_EQ(VoteBin(-0.25, 180), 90);
+  EXPECT_EQ(VoteBin(-0.2501, 180), 89);
+  EXPECT_EQ(VoteBin(10.0, 90), 55);
+}
+
 TEST(EstimateAngleTest, SixPointsAreEnoughFiveAreNot) {
   bool ok = true;
   const PointLists five = Lists({0, 1, 2, 3, 4}, {0, 0, 0, 0, 0});

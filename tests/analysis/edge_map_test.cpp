@@ -10,7 +10,6 @@ namespace {
 
 using namespace Project;
 using AnalysisTest::CountingHost;
-using AnalysisTest::Layout;
 using AnalysisTest::TestFrame;
 
 // Marks every map byte with a value the stage never writes, so that written
@@ -133,23 +132,6 @@ TEST(EdgeMapTest, SourceIsTheOutputBuffer) {
   CountingHost host;
   RunEdgeMap(frame, host);
   EXPECT_EQ(frame.MapAt(14, 5), 0);
-}
-
-TEST(EdgeMapTest, LayoutDoesNotChangeTheMap) {
-  const Layout layouts[] = {{5, 0, false}, {0, 1, true}, {3, 2, true}};
-  TestFrame plain(64, 48, 3);
-  plain.FillRect(20, 10, 44, 36, 60);
-  CountingHost host;
-  RunEdgeMap(plain, host);
-  for (const Layout& layout : layouts) {
-    TestFrame frame(64, 48, 3, false, layout);
-    frame.FillRect(20, 10, 44, 36, 60);
-    CountingHost other;
-    RunEdgeMap(frame, other);
-    for (int y = 0; y < 48; ++y) {
-      for (int x = 0; x < 64; ++x) ASSERT_EQ(frame.MapAt(x, y), plain.MapAt(x, y)) << x << "," << y;
-    }
-  }
 }
 
 TEST(EdgeMapTest, TooSmallExtentWritesNothing) {

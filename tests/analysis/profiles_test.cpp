@@ -100,6 +100,21 @@ TEST(ProfilesTest, TransparencyWeighsOnlyInFilterCases4And5) {
   }
 }
 
+TEST(ProfilesTest, TransparencyWeightIsDividedBeforeTheProduct) {
+  // (255 - s) x (a / 255.0): other groupings round differently for these.
+  TestFrame frame(30, 30, 1, /*alpha=*/true);
+  frame.View().filterCase = 4;
+  frame.Set(3, 5, 0, 1);
+  frame.Set(3, 5, 1, 33);
+  CountingHost host;
+  Profiles p = RunProfiles(frame, host);
+  const double weighted = 254.0 * (33 / 255.0);
+  ASSERT_NE(weighted, 254.0 * (33 * (1 / 255.0)));
+  ASSERT_NE(weighted, 254.0 * 33 / 255.0);
+  EXPECT_EQ(p.rows.data[5], weighted / 255.0);
+  EXPECT_EQ(p.columns.data[3], weighted / 255.0);
+}
+
 TEST(ProfilesTest, LayoutDoesNotChangeAnyBit) {
   const Layout layouts[] = {{}, {13, 0, false}, {0, 2, false}, {7, 1, true}, {0, 0, true}};
   std::vector<double> reference;

@@ -15,7 +15,14 @@ constexpr double kDegreesPerRadian = 57.29577951;
 constexpr int32_t kMinPoints = 6;
 constexpr int32_t kMinWindow = 4;
 
-double FoldToQuarterTurn(double a) {
+double BinCentre(int32_t j, int32_t bins) {
+  return static_cast<double>(j) * 90.0 / static_cast<double>(bins) - 45.0;
+}
+
+}  // namespace
+
+double FoldToQuarterTurn(double degrees) {
+  double a = degrees;
   if (a > 90.0) {
     a -= 180.0;
   } else if (a < -90.0) {
@@ -29,11 +36,9 @@ double FoldToQuarterTurn(double a) {
   return a;
 }
 
-double BinCentre(int32_t j, int32_t bins) {
-  return static_cast<double>(j) * 90.0 / static_cast<double>(bins) - 45.0;
+int32_t VoteBin(double folded, int32_t bins) {
+  return TruncToInt32(std::floor((folded + 45.0) * static_cast<double>(bins) / 90.0 + 0.5));
 }
-
-}  // namespace
 
 double LocalDirection(const DoubleList& xs, const DoubleList& ys, int32_t i, uint32_t w) {
   if (w < 2) return 0.0;
@@ -83,9 +88,7 @@ bool EstimateAngle(const DoubleList& xs, const DoubleList& ys, int32_t bins, dou
 
   const auto window = static_cast<uint32_t>(std::max(n / 32, kMinWindow));
   for (int32_t i = 0; i < n; ++i) {
-    const double a = FoldToQuarterTurn(LocalDirection(xs, ys, i, window));
-    const double position = std::floor((a + 45.0) * static_cast<double>(bins) / 90.0 + 0.5);
-    const int32_t bin = TruncToInt32(position);
+    const int32_t bin = VoteBin(FoldToQuarterTurn(LocalDirection(xs, ys, i, window)), bins);
     if (bin >= 0 && bin < bins) histogram[bin] += 1.0;
   }
 
