@@ -5,7 +5,7 @@
 add_compile_options(-ffp-contract=off -fno-fast-math)
 add_compile_options(-Wall -Wextra -Wpedantic -Wshadow -Wnon-virtual-dtor
                     -Wold-style-cast -Wcast-align -Wunused -Woverloaded-virtual
-                    -Wnull-dereference -Wdouble-promotion -Wformat=2 -Wimplicit-fallthrough)
+ -Wdouble-promotion -Wformat=2 -Wimplicit-fallthrough)
 if(FRINGE_WERROR)
   add_compile_options(-Werror)
 endif()
