@@ -40,7 +40,8 @@ struct MapExtent {
   int32_t width;   // usable columns
   int32_t height;  // usable rows
   int16_t channels;
-  int32_t limit;
+  int32_t threshold;
+  int32_t limit;  // 9t^2
 };
 
 // The channel sum of one source pixel.
@@ -155,8 +156,34 @@ class RowTerms {
   std::unique_ptr<int16_t[]> smooth_[3];
 };
 
+// The edge test for thresholds up to kSmallThreshold, in 16-bit lanes: with
+// |gx| and |gy| capped at 3t + 1 the sum of squares stays below 2^16, and a
+// capped value alone already exceeds 9t^2, so the answer is unchanged.
+constexpr int32_t kSmallThreshold = 60;
+
+struct SmallTest {
+  int16_t cap;     // 3t + 1
+  uint16_t limit;  // 9t^2
+
+  uint8_t operator()(int16_t gx, int16_t gy) const {
+    const auto ax = static_cast<int16_t>(std::min<int16_t>(gx < 0 ? -gx : gx, cap));
+    const auto ay = static_cast<int16_t>(std::min<int16_t>(gy < 0 ? -gy : gy, cap));
+    return static_cast<uint16_t>(ax * ax + ay * ay) > limit ? kEdge : kNoEdge;
+  }
+};
+
+struct WideTest {
+  int32_t limit;
+
+  uint8_t operator()(int16_t gx, int16_t gy) const {
+    return int32_t{gx} * gx + int32_t{gy} * gy > limit ? kEdge : kNoEdge;
+  }
+};
+
 // Map row y from the terms of rows y - 1, y and y + 1, lanes first ... last.
-void LaneRow(RowTerms& terms, int32_t y, int32_t first, int32_t last, int32_t limit,
+// keep marks the lanes that are not a pixel's first byte (null: none).
+template <typename Test>
+void LaneRow(RowTerms& terms, int32_t y, int32_t first, int32_t last, Test test,
              const uint8_t* __restrict keep, uint8_t* __restrict target) {
   const int16_t* __restrict d0 = terms.Difference(y - 1);
   const int16_t* __restrict d1 = terms.Difference(y);
@@ -165,17 +192,16 @@ void LaneRow(RowTerms& terms, int32_t y, int32_t first, int32_t last, int32_t li
   const int16_t* __restrict s2 = terms.Smooth(y + 1);
   if (keep == nullptr) {
     for (int32_t i = first; i <= last; ++i) {
-      const int32_t gx = d0[i] + 2 * d1[i] + d2[i];
-      const int32_t gy = s2[i] - s0[i];
-      target[i] = gx * gx + gy * gy > limit ? kEdge : kNoEdge;
+      const auto gx = static_cast<int16_t>(d0[i] + 2 * d1[i] + d2[i]);
+      const auto gy = static_cast<int16_t>(s2[i] - s0[i]);
+      target[i] = test(gx, gy);
     }
     return;
   }
   for (int32_t i = first; i <= last; ++i) {
-    const int32_t gx = d0[i] + 2 * d1[i] + d2[i];
-    const int32_t gy = s2[i] - s0[i];
-    const uint8_t value = gx * gx + gy * gy > limit ? kEdge : kNoEdge;
-    target[i] = static_cast<uint8_t>((value & ~keep[i]) | (target[i] & keep[i]));
+    const auto gx = static_cast<int16_t>(d0[i] + 2 * d1[i] + d2[i]);
+    const auto gy = static_cast<int16_t>(s2[i] - s0[i]);
+    target[i] = static_cast<uint8_t>((test(gx, gy) & ~keep[i]) | (target[i] & keep[i]));
   }
 }
 
@@ -209,6 +235,8 @@ bool LaneMap(const FrameView& frame, AnalysisHost& host, const MapExtent& e,
   };
   const int32_t first = step;
   const int32_t last = (e.width - 6) * step;
+  const bool small = e.threshold >= -kSmallThreshold && e.threshold <= kSmallThreshold;
+  const auto cap = static_cast<int16_t>(3 * (e.threshold < 0 ? -e.threshold : e.threshold) + 1);
   terms.Make(0, source(0), lanes, step, e.channels);
   terms.Make(1, source(1), lanes, step, e.channels);
   for (int32_t y = 1; y <= e.height - 4; ++y) {
@@ -216,7 +244,12 @@ bool LaneMap(const FrameView& frame, AnalysisHost& host, const MapExtent& e,
     TakeProgressStep(progress, host);
     terms.Make(y + 1, source(y + 1), lanes, step, e.channels);
     uint8_t* target = PixelAt(frame.inData, 0, y, frame.inRowBytes, step);
-    LaneRow(terms, y, first, last, e.limit, keep.get(), target);
+    if (small) {
+      LaneRow(terms, y, first, last, SmallTest{cap, static_cast<uint16_t>(e.limit)}, keep.get(),
+              target);
+    } else {
+      LaneRow(terms, y, first, last, WideTest{e.limit}, keep.get(), target);
+    }
   }
   return true;
 }
@@ -231,7 +264,7 @@ void BuildEdgeMap(const FrameView& frame, AnalysisHost& host, int32_t threshold,
   const int32_t outHeight = Extent(frame.outRect.top, frame.outRect.bottom);
   if (width < 3 || height < 3 || outWidth < 3 || outHeight < 3) return;
   const MapExtent e{std::min(width, outWidth), std::min(height, outHeight),
-                    ChannelCount(frame.imageMode, 0), 9 * threshold * threshold};
+                    ChannelCount(frame.imageMode, 0), threshold, 9 * threshold * threshold};
   if (e.height - 4 < 1) return;
 
   if (LaneMap(frame, host, e, progress)) return;
