@@ -120,11 +120,18 @@ class RowTerms {
   // Makes the terms of source row `row` from its bytes.
   void Make(int32_t row, const uint8_t* __restrict bytes, int32_t lanes, int32_t step,
             int16_t channels) {
+    int16_t* __restrict d = Difference(row);
+    int16_t* __restrict s = Smooth(row);
+    if (channels == 1) {
+      // One channel: the sums are the bytes themselves.
+      for (int32_t i = step; i < lanes - step; ++i) {
+        d[i] = static_cast<int16_t>(bytes[i + step] - bytes[i - step]);
+        s[i] = static_cast<int16_t>(bytes[i - step] + 2 * bytes[i] + bytes[i + step]);
+      }
+      return;
+    }
     int16_t* __restrict p = sums_.get();
     switch (channels) {
-      case 1:
-        for (int32_t i = 0; i < lanes; ++i) p[i] = bytes[i];
-        break;
       case 2:
         for (int32_t i = 0; i < lanes; ++i) p[i] = static_cast<int16_t>(bytes[i] + bytes[i + 1]);
         break;
@@ -139,8 +146,6 @@ class RowTerms {
         }
         break;
     }
-    int16_t* __restrict d = Difference(row);
-    int16_t* __restrict s = Smooth(row);
     for (int32_t i = step; i < lanes - step; ++i) {
       d[i] = static_cast<int16_t>(p[i + step] - p[i - step]);
       s[i] = static_cast<int16_t>(p[i - step] + 2 * p[i] + p[i + step]);
