@@ -6,6 +6,7 @@
 
 #include "filter/analysis/frame.h"
 #include "filter/analysis/records.h"
+#include "filter/analysis/stage_set.h"
 #include "filter/analysis/types.h"
 
 namespace Project {
@@ -16,5 +17,9 @@ AnalysisParams MakeAnalysisParams(int16_t width, int16_t height);
 // One run over the frame the host delivered. Exceptions from the record
 // writers pass through after everything the run holds is released.
 void RunAnalysis(const FrameView& frame, AnalysisHost& host, AnalysisResult& result);
+
+// The same run through the given stage implementations.
+void RunAnalysisWith(const StageSet& stages, const FrameView& frame, AnalysisHost& host,
+                     AnalysisResult& result);
 
 }  // namespace Project
