@@ -32,17 +32,30 @@ void Fail(const std::string& what) {
 
 RunFaults::RunFaults() : codes_{0, 1, -50, -108, -109, -128} {}
 
+namespace {
+// FRINGE_FUZZ_VERBOSE=1 shows the faults of each input, for reading a finding.
+void Tell(const char* what, Standin::Proc proc, int32_t error) {
+  static const bool verbose = std::getenv("FRINGE_FUZZ_VERBOSE") != nullptr;
+  if (verbose) std::fprintf(stderr, "fault: %s %s %d\n", what, Standin::ProcName(proc), error);
+}
+}  // namespace
+
 void RunFaults::Removed(Standin::Proc proc) {
+  Tell("removed", proc, 0);
   if (proc == Standin::Proc::DescriptorClose) closeMissing_ = true;
 }
 
 void RunFaults::Failing(Standin::Proc proc, int32_t error) {
+  Tell(error == 0 ? "raising" : "failing", proc, error);
   if (error != 0) codes_.insert(error);
   if (Disposes(proc)) disposalBroken_ = true;
   if (proc == Standin::Proc::DescriptorClose) closeMissing_ = true;
 }
 
 void RunFaults::Shaped(Standin::Table table) {
+  if (std::getenv("FRINGE_FUZZ_VERBOSE") != nullptr) {
+    std::fprintf(stderr, "fault: table %d shaped\n", static_cast<int>(table));
+  }
   // A shortened write table can keep open while losing close.
   if (table == Standin::Table::DescriptorWrite) closeMissing_ = true;
 }

@@ -1,6 +1,8 @@
 // A broken or hostile host: what the module can check it checks, and answers
 // with the whole-document failure record instead of reading memory it was not
 // given. Every case must run clean under the sanitizers too.
+#include <algorithm>
+
 #include "e2e_support.h"
 
 namespace {
@@ -147,6 +149,24 @@ TEST_F(HostileHost, MissingProceduresAreDoneWithoutOrAnsweredWithACode) {
     }
     host_->Faults().Restore(proc);
     host_->Problems().Clear();
+  }
+}
+
+TEST_F(HostileHost, ADescriptorPutThatThrowsStillClosesItsToken) {
+  for (Proc put : {Proc::DescriptorPutInteger, Proc::DescriptorPutFloat}) {
+    for (int32_t call : {1, 2}) {
+      host_->Faults().RaiseAt(put, call);
+      Standin::RunReport report = host_->Run();
+      EXPECT_EQ(std::count(report.results.begin(), report.results.end(), int16_t{1}), 1)
+          << Standin::ProcName(put) << " " << call;
+      // The incomplete descriptor is not handed over.
+      EXPECT_FALSE(host_->LastDescriptor().has_value());
+      EXPECT_EQ(host_->Calls(Proc::DescriptorClose), host_->Calls(Proc::DescriptorOpen));
+      ExpectClean(*host_);
+      EXPECT_EQ(TakeAlerts().size(), 1u);
+      host_->Faults().Restore(put);
+      host_->Faults().ResetCalls();
+    }
   }
 }
 
