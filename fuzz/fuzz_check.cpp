@@ -48,7 +48,9 @@ void RunFaults::Removed(Standin::Proc proc) {
 void RunFaults::Failing(Standin::Proc proc, int32_t error) {
   Tell(error == 0 ? "raising" : "failing", proc, error);
   if (error != 0) codes_.insert(error);
-  if (Disposes(proc)) disposalBroken_ = true;
+  // A raise unwinds through the module from wherever it happens; not every
+  // path that unwinds gives back what it holds (see the report).
+  if (Disposes(proc) || error == 0) disposalBroken_ = true;
   if (proc == Standin::Proc::DescriptorClose) closeMissing_ = true;
 }
 

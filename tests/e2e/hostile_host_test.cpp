@@ -170,6 +170,19 @@ TEST_F(HostileHost, ADescriptorPutThatThrowsStillClosesItsToken) {
   }
 }
 
+TEST_F(HostileHost, ALockThatThrowsWhilePublishingLosesNoHandle) {
+  // The record's handle is the last one locked before it is published.
+  host_->Run();
+  const int32_t locks = host_->Calls(Proc::HandleLock);
+  ASSERT_GT(locks, 0);
+  host_->Faults().ResetCalls();
+  host_->Faults().RaiseAt(Proc::HandleLock, locks);
+  host_->Run();
+  EXPECT_EQ(host_->Calls(Proc::HandleDispose), host_->Calls(Proc::HandleNew));
+  ExpectClean(*host_);
+  EXPECT_EQ(TakeAlerts().size(), 1u);
+}
+
 TEST_F(HostileHost, MissingOrEmptyTablesAreDoneWithout) {
   for (Table table :
        {Table::Handle, Table::DataRecord, Table::Property, Table::Buffer, Table::DescriptorWrite,
