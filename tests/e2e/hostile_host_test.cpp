@@ -153,8 +153,11 @@ TEST_F(HostileHost, MissingProceduresAreDoneWithoutOrAnsweredWithACode) {
 }
 
 TEST_F(HostileHost, ADescriptorPutThatThrowsStillClosesItsToken) {
-  for (Proc put : {Proc::DescriptorPutInteger, Proc::DescriptorPutFloat}) {
-    for (int32_t call : {1, 2}) {
+  // The angle is the one float; integers come before and after it.
+  for (auto [put, call] :
+       {std::pair{Proc::DescriptorPutInteger, 1}, std::pair{Proc::DescriptorPutInteger, 2},
+        std::pair{Proc::DescriptorPutFloat, 1}}) {
+    {
       host_->Faults().RaiseAt(put, call);
       Standin::RunReport report = host_->Run();
       EXPECT_EQ(std::count(report.results.begin(), report.results.end(), int16_t{1}), 1)
