@@ -26,8 +26,7 @@ FrameView FrameViewFromRecord(const Vireo::FilterRecord& record) {
   frame.outRowBytes = record.outRowBytes;
   // A host that leaves the output column distance at 0 does not report it: the
   // output is then read with the input's, as the host lays both out alike.
-  frame.outColumnBytes =
-      record.outColumnBytes != 0 ? record.outColumnBytes : record.inColumnBytes;
+  frame.outColumnBytes = record.outColumnBytes != 0 ? record.outColumnBytes : record.inColumnBytes;
   return frame;
 }
 
