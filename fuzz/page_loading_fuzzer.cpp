@@ -42,6 +42,9 @@ extern "C" int LLVMFuzzerInitialize(int*, char*** argv) {
   vips_block_untrusted_set(TRUE);
   vips_cache_set_max(0);
   vips_concurrency_set(1);
+  // The path must exist before the exit handler is registered, so that it is
+  // destroyed after the handler has used it.
+  ScratchFile();
   std::atexit(RemoveScratch);
   return 0;
 }
