@@ -1,0 +1,22 @@
+#!/usr/bin/env bash
+# Builds every preset and runs every test: native, sanitizers, Windows under Wine.
+set -euo pipefail
+cd "$(dirname "$0")/.."
+jobs="${FRINGE_JOBS:-2}"
+
+run_preset() {
+  local preset="$1"
+  echo "== $preset: configure and build"
+  cmake --preset "$preset" >/dev/null
+  cmake --build --preset "$preset" -j "$jobs"
+  echo "== $preset: test"
+  ctest --preset "$preset" -j "$jobs"
+}
+
+run_preset release
+run_preset asan
+bash scripts/wine-prefix.sh
+run_preset windows
+echo "== format"
+bash scripts/check-format.sh
+echo "all presets passed"
