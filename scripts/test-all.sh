@@ -14,6 +14,8 @@ run_preset() {
 }
 
 run_preset release
+echo "== memcheck: one complete run under valgrind"
+bash scripts/memcheck.sh
 run_preset asan
 bash scripts/wine-prefix.sh
 run_preset windows
