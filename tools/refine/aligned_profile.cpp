@@ -44,6 +44,12 @@ double StepEnergy(const std::vector<std::vector<double>>& groups, const std::vec
   return energy;
 }
 
+double MedianOf(std::vector<double>& v) {
+  const auto mid = static_cast<std::ptrdiff_t>(v.size() / 2);
+  std::nth_element(v.begin(), v.begin() + mid, v.end());
+  return v[static_cast<size_t>(mid)];
+}
+
 }  // namespace
 
 double Interpolate(const std::vector<double>& values, double index) {
@@ -78,7 +84,7 @@ AlignedProfile AlignProfiles(const ProfileStrip& strip, double maxSlope) {
       double sum = 0.0;
       int n = 0;
       for (int line = first; line < last; ++line) {
-        const float v = strip.At(line, k);
+        const double v = strip.At(line, k);
         if (std::isnan(v)) continue;
         sum += v;
         ++n;
@@ -114,33 +120,33 @@ AlignedProfile AlignProfiles(const ProfileStrip& strip, double maxSlope) {
   }
   out.slope = bestSlope;
 
-  // Aligned mean and roughness over all lines.
-  std::vector<double> previous(static_cast<size_t>(width), kNaN);
-  std::vector<double> sum(static_cast<size_t>(width), 0.0), rough(static_cast<size_t>(width), 0.0);
-  std::vector<int> count(static_cast<size_t>(width), 0), roughCount(static_cast<size_t>(width), 0);
-  for (int line = 0; line < strip.lines; ++line) {
-    const double shift = bestSlope * (strip.t[static_cast<size_t>(line)] - out.tCentre) / strip.sStep;
-    for (int k = 0; k < width; ++k) {
-      const double v = InterpolateLine(strip, line, k + shift);
-      auto& prev = previous[static_cast<size_t>(k)];
-      if (!std::isnan(v)) {
-        sum[static_cast<size_t>(k)] += v;
-        ++count[static_cast<size_t>(k)];
-        if (!std::isnan(prev)) {
-          rough[static_cast<size_t>(k)] += std::abs(v - prev);
-          ++roughCount[static_cast<size_t>(k)];
-        }
-      }
-      prev = v;
-    }
-  }
+  // Aligned median and roughness over all lines. Medians, so that dust, hairs
+  // and specks on a few lines leave the profile alone.
+  std::vector<double> shifts(static_cast<size_t>(strip.lines));
+  for (int line = 0; line < strip.lines; ++line)
+    shifts[static_cast<size_t>(line)] = bestSlope * (strip.t[static_cast<size_t>(line)] - out.tCentre) / strip.sStep;
+  std::vector<double> values, steps;
+  values.reserve(static_cast<size_t>(strip.lines));
+  steps.reserve(static_cast<size_t>(strip.lines));
   for (int k = 0; k < width; ++k) {
-    const auto i = static_cast<size_t>(k);
-    if (2 * count[i] >= strip.lines) out.mean[i] = sum[i] / count[i];
-    if (roughCount[i] > 0 && 2 * count[i] >= strip.lines) out.roughness[i] = rough[i] / roughCount[i];
+    values.clear();
+    steps.clear();
+    double previous = kNaN;
+    for (int line = 0; line < strip.lines; ++line) {
+      const double v = InterpolateLine(strip, line, k + shifts[static_cast<size_t>(line)]);
+      if (!std::isnan(v)) {
+        values.push_back(v);
+        if (!std::isnan(previous)) steps.push_back(std::abs(v - previous));
+      }
+      previous = v;
+    }
+    if (2 * static_cast<int>(values.size()) < strip.lines || values.empty()) continue;
+    out.mean[static_cast<size_t>(k)] = MedianOf(values);
+    // For two values with independent noise sigma, the median |difference| is 0.954 sigma.
+    if (!steps.empty()) out.roughness[static_cast<size_t>(k)] = MedianOf(steps) / 0.954;
   }
 
-  // Noise: the calmest stretch of roughness; E|a - b| = 2 sigma / sqrt(pi) for two noisy values.
+  // Noise: the calmest stretch of roughness.
   double calmest = std::numeric_limits<double>::infinity();
   for (int k = 2; k + 2 < width; ++k) {
     double s = 0.0;
@@ -154,7 +160,7 @@ AlignedProfile AlignProfiles(const ProfileStrip& strip, double maxSlope) {
     }
     if (n == 5) calmest = std::min(calmest, s / n);
   }
-  out.noise = std::isfinite(calmest) ? calmest * 0.886 : 0.0;
+  out.noise = std::isfinite(calmest) ? calmest : 0.0;
   return out;
 }
 

@@ -25,7 +25,7 @@ std::vector<FitSample> LocateEdges(const GraySampler& sampler, const SampleArea&
       double sum = 0.0;
       for (int m = -half; m <= half && ok; ++m) {
         const Vec2 p = frame.At(at + m, s);
-        float v = 0.0f;
+        double v = 0.0;
         ok = area.Contains(p) && sampler.Sample(p.x, p.y, v);
         sum += v;
       }

@@ -17,19 +17,19 @@ std::string CheckPageImage(const PageImage& page) {
   return {};
 }
 
-bool GraySampler::Sample(double x, double y, float& value) const {
+bool GraySampler::Sample(double x, double y, double& value) const {
   if (!(x >= 0.0) || !(y >= 0.0)) return false;  // also rejects NaN
   const double maxX = static_cast<double>(page_.width - 1);
   const double maxY = static_cast<double>(page_.height - 1);
   if (x > maxX || y > maxY) return false;
   auto x0 = static_cast<int32_t>(x);
   auto y0 = static_cast<int32_t>(y);
-  const auto fx = static_cast<float>(x - x0);
-  const auto fy = static_cast<float>(y - y0);
+  const double fx = x - x0;
+  const double fy = y - y0;
   const int32_t x1 = x0 + 1 < page_.width ? x0 + 1 : x0;
   const int32_t y1 = y0 + 1 < page_.height ? y0 + 1 : y0;
-  const float top = Pixel(x0, y0) + (Pixel(x1, y0) - Pixel(x0, y0)) * fx;
-  const float bottom = Pixel(x0, y1) + (Pixel(x1, y1) - Pixel(x0, y1)) * fx;
+  const double top = Pixel(x0, y0) + (Pixel(x1, y0) - Pixel(x0, y0)) * fx;
+  const double bottom = Pixel(x0, y1) + (Pixel(x1, y1) - Pixel(x0, y1)) * fx;
   value = top + (bottom - top) * fy;
   return true;
 }

@@ -29,15 +29,15 @@ class GraySampler {
   int32_t Width() const { return page_.width; }
   int32_t Height() const { return page_.height; }
 
-  float Pixel(int32_t x, int32_t y) const {
+  double Pixel(int32_t x, int32_t y) const {
     const uint8_t* p = page_.pixels + static_cast<std::ptrdiff_t>(y) * page_.rowBytes +
                        static_cast<std::ptrdiff_t>(x) * page_.pixelBytes;
-    if (page_.channels == 1) return static_cast<float>(p[0]);
-    return static_cast<float>(p[0] + p[1] + p[2]) * (1.0f / 3.0f);
+    if (page_.channels == 1) return p[0];
+    return (p[0] + p[1] + p[2]) * (1.0 / 3.0);
   }
 
   // Bilinear value at (x, y); false when the point lies outside the pixel centres' hull.
-  bool Sample(double x, double y, float& value) const;
+  bool Sample(double x, double y, double& value) const;
 
  private:
   PageImage page_;

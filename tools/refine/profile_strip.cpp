@@ -16,20 +16,20 @@ ProfileStrip SampleStrip(const GraySampler& sampler, const SampleArea& area, con
   strip.values.assign(static_cast<size_t>(strip.lines) * static_cast<size_t>(width),
                       std::numeric_limits<float>::quiet_NaN());
   const int half = smear / 2;
-  const float scale = 1.0f / static_cast<float>(2 * half + 1);
+  const double scale = 1.0 / (2 * half + 1);
   for (int line = 0; line < strip.lines; ++line) {
     float* out = strip.values.data() + static_cast<size_t>(line) * static_cast<size_t>(width);
     for (int k = 0; k < width; ++k) {
       const double s = sFrom + sStep * k;
-      float sum = 0.0f;
+      double sum = 0.0;
       bool ok = true;
       for (int m = -half; m <= half && ok; ++m) {
         const Vec2 p = frame.At(t[static_cast<size_t>(line)] + m, s);
-        float v = 0.0f;
+        double v = 0.0;
         ok = area.Contains(p) && sampler.Sample(p.x, p.y, v);
         sum += v;
       }
-      if (ok) out[k] = sum * scale;
+      if (ok) out[k] = static_cast<float>(sum * scale);
     }
   }
   return strip;

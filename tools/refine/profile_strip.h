@@ -19,7 +19,7 @@ struct ProfileStrip {
   std::vector<double> t;      // position of each line along the side
   std::vector<float> values;  // lines x width; NaN where the area ends
 
-  float At(int line, int k) const { return values[static_cast<size_t>(line) * static_cast<size_t>(width) + static_cast<size_t>(k)]; }
+  double At(int line, int k) const { return values[static_cast<size_t>(line) * static_cast<size_t>(width) + static_cast<size_t>(k)]; }
   double OffsetOf(int k) const { return sFrom + sStep * k; }
 };
 

@@ -22,6 +22,9 @@ constexpr double kDegree = std::numbers::pi / 180.0;
 
 struct SideWork {
   SideFrame frame;
+  double trim = 0.0;  // length left out at each end of the side
+  bool usable = false;
+  AlignedProfile profile;
   SideReading reading;
   SideResult result;
   bool innerFound = false;
@@ -39,6 +42,18 @@ Line PageEdgeLine(const SampleArea& area, const SideFrame& frame) {
   return Line{{0.0, y}, {1.0, 0.0}};
 }
 
+// From the middle of a side outward to the edge of the sampled area.
+double DistanceToArea(const SampleArea& area, const SideFrame& frame) {
+  const Vec2 mid = frame.At(0.5 * frame.length, 0.0);
+  const Vec2 n = frame.outward;
+  double d = 1e9;
+  if (n.x > 1e-6) d = std::min(d, (area.right - mid.x) / n.x);
+  if (n.x < -1e-6) d = std::min(d, (area.left - mid.x) / n.x);
+  if (n.y > 1e-6) d = std::min(d, (area.bottom - mid.y) / n.y);
+  if (n.y < -1e-6) d = std::min(d, (area.top - mid.y) / n.y);
+  return std::max(0.0, d);
+}
+
 int SmearFor(double noise) {
   // Average enough lines along the side that a single profile's noise stays
   // near three gray levels.
@@ -47,32 +62,22 @@ int SmearFor(double noise) {
   return n | 1;
 }
 
-void RefineSide(const GraySampler& sampler, const SampleArea& area, const Quad& quad, int side,
-                double searchReach, double maxMargin, SideWork& work) {
-  work.frame = SideFrameOf(quad, side);
-  const SideFrame& frame = work.frame;
-  SideResult& result = work.result;
-  result.status = SideStatus::kKept;
-  result.line = LineInFrame(frame, 0.0, 0.0);
-  const double length = frame.length;
-  if (length < 24.0) {
-    result.note = "side too short";
-    return;
-  }
-  // Stay clear of the corners, where the neighbouring side's edge and shadow lie.
-  const double trim = std::max(10.0, 0.08 * length);
+// The side's typical profile from sFrom to sTo across it.
+AlignedProfile MeasureSide(const GraySampler& sampler, const SampleArea& area, const SideWork& work,
+                           double sFrom, double sTo) {
+  const double length = work.frame.length;
+  const int lines = std::clamp(static_cast<int>(length / 6.0), 16, 120);
+  const auto t = SpreadPositions(work.trim, length - work.trim, lines);
+  const int width = static_cast<int>(std::floor(sTo - sFrom)) + 1;
+  const ProfileStrip strip = SampleStrip(sampler, area, work.frame, t, sFrom, 1.0, width);
+  return AlignProfiles(strip, std::tan(0.7 * kDegree));
+}
 
-  // The structure: profiles far enough in and out to meet the paper's edge
-  // even where the module took its side from a shadow, a margin or dust.
-  const int structureLines = std::clamp(static_cast<int>(length / 6.0), 16, 120);
-  const auto tStructure = SpreadPositions(trim, length - trim, structureLines);
-  const int width = 2 * static_cast<int>(searchReach) + 1;
-  const ProfileStrip strip = SampleStrip(sampler, area, frame, tStructure, -searchReach, 1.0, width);
-  const AlignedProfile aligned = AlignProfiles(strip, std::tan(0.7 * kDegree));
-  ReadOptions readOptions;
-  readOptions.maxMarginWidth = maxMargin;
-  work.reading = ReadSide(aligned, readOptions);
+// Fits the side's line to the step its reading chose, position by position.
+void PlaceSide(const GraySampler& sampler, const SampleArea& area, SideWork& work) {
+  const SideFrame& frame = work.frame;
   const SideReading& reading = work.reading;
+  SideResult& result = work.result;
   result.note = reading.note;
   result.band = reading.band;
   result.margin = reading.margin;
@@ -88,6 +93,7 @@ void RefineSide(const GraySampler& sampler, const SampleArea& area, const Quad& 
 
   // Every position along the side: the step the reading chose, in a window
   // narrow enough to keep the shadow band's other side out.
+  const double length = frame.length;
   LocateRequest request;
   request.offset = reading.offset;
   request.slope = reading.slope;
@@ -98,7 +104,7 @@ void RefineSide(const GraySampler& sampler, const SampleArea& area, const Quad& 
   const double lineNoise = reading.noise / std::sqrt(static_cast<double>(request.smear));
   request.minGradient = std::max({2.0, 3.0 * lineNoise, 0.25 * reading.gradient});
   const int fineLines = std::clamp(static_cast<int>(length / 2.0), 20, 500);
-  const auto tFine = SpreadPositions(trim, length - trim, fineLines);
+  const auto tFine = SpreadPositions(work.trim, length - work.trim, fineLines);
   const auto samples = LocateEdges(sampler, area, frame, tFine, request);
   const LineFitResult fit = FitLineRobust(samples);
 
@@ -116,7 +122,7 @@ void RefineSide(const GraySampler& sampler, const SampleArea& area, const Quad& 
     }
   }
   if (result.status == SideStatus::kKept && reading.gradient >= 3.0) {
-    // Too few single positions agree, but the mean profile shows the step clearly.
+    // Too few single positions agree, but the typical profile shows the step clearly.
     result.status = SideStatus::kCoarse;
     result.line = LineInFrame(frame, coarseOffset, reading.slope);
     result.support = fit.ok ? static_cast<double>(fit.inliers) / fineLines : 0.0;
@@ -151,6 +157,29 @@ double MidShiftBetween(const SideFrame& frame, const Line& outer, const Line& in
   return across(outer) - across(inner);
 }
 
+// The outline's turn from the sides placed on steps in the page only: a page
+// edge or a kept side says nothing about how the paper lies.
+double AngleOfSides(const Quad& quad, const std::array<SideResult, 4>& sides, double fallback) {
+  Quad masked = quad;
+  double weighted = 0.0, total = 0.0, reference = 0.0;
+  for (int k = 0; k < 4; ++k) {
+    const SideStatus status = sides[k].status;
+    if (status != SideStatus::kRefined && status != SideStatus::kCoarse && status != SideStatus::kInferred) continue;
+    const Vec2 d = masked[(k + 1) % 4] - masked[k];
+    const double len = Length(d);
+    double a = FoldedDirectionDegrees(d);
+    if (total == 0.0) {
+      reference = a;
+    } else {
+      if (a - reference > 45.0) a -= 90.0;
+      if (a - reference < -45.0) a += 90.0;
+    }
+    weighted += a * len;
+    total += len;
+  }
+  return total > 0.0 ? -(weighted / total) : fallback;
+}
+
 }  // namespace
 
 std::string_view StatusName(RefineStatus status) {
@@ -183,14 +212,21 @@ ModuleAnswer ModuleAnswer::FromPoints(const std::array<int32_t, 8>& points, doub
   return answer;
 }
 
-Refinement RefineOutline(const PageImage& page, const ModuleAnswer& answer, const RefineOptions& options) {
+Refinement Unrefined(const ModuleAnswer& answer, std::string reason) {
   Refinement out;
+  out.status = answer.FoundPhoto() ? RefineStatus::kKept : RefineStatus::kNoPhoto;
+  out.reason = std::move(reason);
   out.outline = answer.corners;
   out.picture = answer.corners;
   out.angle = answer.angle;
   for (int k = 0; k < 4; ++k) {
     if (auto line = LineThrough(answer.corners[k], answer.corners[(k + 1) % 4])) out.sides[k].line = *line;
   }
+  return out;
+}
+
+Refinement RefineOutline(const PageImage& page, const ModuleAnswer& answer, const RefineOptions& options) {
+  Refinement out = Unrefined(answer, "");
   if (const std::string problem = CheckPageImage(page); !problem.empty()) {
     out.status = RefineStatus::kKept;
     out.reason = problem;
@@ -213,10 +249,54 @@ Refinement RefineOutline(const PageImage& page, const ModuleAnswer& answer, cons
   const double across = std::min(Distance(answer.corners[0], answer.corners[1]),
                                  Distance(answer.corners[1], answer.corners[2]));
   const double reach = std::clamp(std::round(0.12 * across), 40.0, 200.0);
+  // maxMargin stays inside the first search band so that a margin's outer edge is seen there.
   const double maxMargin = options.findMargin ? std::min(reach - 12.0, 0.12 * across) : 0.0;
 
   std::array<SideWork, 4> work;
-  for (int k = 0; k < 4; ++k) RefineSide(sampler, area, answer.corners, k, reach, maxMargin, work[k]);
+  for (int k = 0; k < 4; ++k) {
+    SideWork& w = work[k];
+    w.frame = SideFrameOf(answer.corners, k);
+    w.result.line = LineInFrame(w.frame, 0.0, 0.0);
+    w.trim = std::max(10.0, 0.08 * w.frame.length);
+    w.usable = w.frame.length >= 24.0;
+    if (!w.usable) {
+      w.result.note = "side too short";
+      continue;
+    }
+    // Far enough in and out to meet the paper's edge even where the module
+    // took its side from a shadow, a margin or dust.
+    w.profile = MeasureSide(sampler, area, w, -reach, reach);
+  }
+  // The page's noise: the calmest side's (the lid is the same all round).
+  double pageNoise = 0.0;
+  for (const SideWork& w : work) {
+    if (w.usable && w.profile.noise > 0.0 && (pageNoise == 0.0 || w.profile.noise < pageNoise))
+      pageNoise = w.profile.noise;
+  }
+  ReadOptions readOptions;
+  readOptions.maxMarginWidth = maxMargin;
+  readOptions.pageNoise = pageNoise;
+  for (int k = 0; k < 4; ++k) {
+    SideWork& w = work[k];
+    if (!w.usable) continue;
+    w.reading = ReadSide(w.profile, readOptions);
+    if (!w.reading.found) {
+      // The module's side is far off (a bed strip, dust, a picture edge taken
+      // for the paper's): look again in a band three times as wide.
+      // Outward, as far as the page's edge if the paper may run on to it.
+      const double in = std::min(3.0 * reach, 0.45 * across);
+      const double outward = std::min(std::max(3.0 * reach, DistanceToArea(area, w.frame) + 2.0), across);
+      AlignedProfile wide = MeasureSide(sampler, area, w, -in, outward);
+      SideReading again = ReadSide(wide, readOptions);
+      if (again.found) {
+        again.note += " (found in a wider search)";
+        w.profile = std::move(wide);
+        w.reading = again;
+      }
+    }
+    if (options.inspect) options.inspect(k, w.profile, w.reading);
+    PlaceSide(sampler, area, w);
+  }
 
   // A white margin is a property of the print: believe it only where most
   // sides show one, then carry its width to sides where it cannot be seen.
@@ -225,7 +305,9 @@ Refinement RefineOutline(const PageImage& page, const ModuleAnswer& answer, cons
     if (work[k].innerFound && work[k].result.status != SideStatus::kKept)
       widths.push_back(MidShiftBetween(work[k].frame, work[k].result.line, work[k].inner));
   }
-  const bool margin = widths.size() >= 3;
+  // Two sides whose widths agree, or three or more.
+  bool margin = widths.size() >= 3;
+  if (widths.size() == 2) margin = std::abs(widths[0] - widths[1]) <= std::max(4.0, 0.2 * std::max(widths[0], widths[1]));
   std::array<Line, 4> innerLines{};
   if (margin) {
     std::sort(widths.begin(), widths.end());
@@ -249,17 +331,19 @@ Refinement RefineOutline(const PageImage& page, const ModuleAnswer& answer, cons
 
   std::array<Line, 4> lines{};
   int refined = 0;
+  int edges = 0;  // sides placed on a step seen in the page
   for (int k = 0; k < 4; ++k) {
     lines[k] = work[k].result.line;
     out.sides[k] = work[k].result;
-    if (work[k].result.status != SideStatus::kKept) ++refined;
+    const SideStatus status = work[k].result.status;
+    if (status != SideStatus::kKept) ++refined;
+    if (status == SideStatus::kRefined || status == SideStatus::kCoarse || status == SideStatus::kInferred) ++edges;
   }
-  if (refined == 0) {
-    bool anyStep = false;
-    for (const SideWork& w : work) anyStep = anyStep || w.reading.found;
-    out.status = anyStep ? RefineStatus::kKept : RefineStatus::kNoPhoto;
-    out.reason = anyStep ? "no side could be placed more precisely"
-                         : "no edge near the module's outline: nothing on the page stands out";
+  if (edges == 0) {
+    // Not one side of the module's outline lies on a step in the page: what
+    // it found is lid texture, noise or the page's own edge.
+    out.status = RefineStatus::kNoPhoto;
+    out.reason = "no edge along the module's outline: nothing on the page stands out";
     return out;
   }
 
@@ -283,7 +367,7 @@ Refinement RefineOutline(const PageImage& page, const ModuleAnswer& answer, cons
   }
 
   out.outline = *corners;
-  out.angle = OutlineAngleDegrees(*corners);
+  out.angle = AngleOfSides(*corners, out.sides, answer.angle);
   out.status = refined == 4 ? RefineStatus::kRefined : RefineStatus::kPartial;
   out.reason = refined == 4 ? "every side found again" : "some sides kept from the module's answer";
   out.picture = *corners;

@@ -11,6 +11,7 @@
 
 #include <array>
 #include <cstdint>
+#include <functional>
 #include <optional>
 #include <string>
 
@@ -76,8 +77,13 @@ struct RefineOptions {
   // unset: the whole page.
   std::optional<SampleArea> area;
   bool findMargin = true;  // look for a white paper margin
+  // Called with each side's mean profile and its reading, for diagnostics.
+  std::function<void(int side, const struct AlignedProfile&, const struct SideReading&)> inspect;
 };
 
 Refinement RefineOutline(const PageImage& page, const ModuleAnswer& answer, const RefineOptions& options = {});
+
+// The module's answer passed on as it is (kKept, or kNoPhoto when it found none).
+Refinement Unrefined(const ModuleAnswer& answer, std::string reason);
 
 }  // namespace Refine

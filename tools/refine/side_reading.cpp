@@ -90,9 +90,11 @@ class Reader {
       }
       if (c == 3) rough_[static_cast<size_t>(k)] = s / c;
     }
-    calm_ = profile.noise * 1.128;
-    const double meanNoise = profile.noise / std::sqrt(std::max(1, profile.lines));
-    gradThreshold_ = std::max(1.5, 6.0 * meanNoise);
+    calm_ = options.pageNoise > 0.0 ? options.pageNoise : profile.noise;
+    // A median of n values scatters about 1.25 sigma / sqrt(n).
+    const double meanNoise = 1.25 * calm_ / std::sqrt(std::max(1, profile.lines));
+    gradThreshold_ = std::max(1.0, 5.0 * meanNoise);
+    stepThreshold_ = std::max(3.0, 8.0 * meanNoise);
     FindLid();
     FindCandidates();
   }
@@ -102,7 +104,7 @@ class Reader {
     r.slope = p_.slope;
     r.tCentre = p_.tCentre;
     r.lid = lid_;
-    r.noise = p_.noise;
+    r.noise = calm_;
     if (std::isnan(lid_)) {
       r.note = "no lid in reach";
       return PageEdgeOr(r);
@@ -112,8 +114,11 @@ class Reader {
     // page outside: the paper's edge or the outer side of a shadow band.
     const Candidate* outer = nullptr;
     for (const Candidate& c : candidates_) {
-      if (LidLike(c.k - 7.0, c.k - 2.0)) continue;  // dust or lid texture
       if (!Smooth(c.k + 2.0, c.k + 7.0)) continue;  // not the page outside
+      // A step between two levels; dust and lid texture wiggle about one.
+      const double inside = mean_.Mean(c.k - 7.0, c.k - 2.0);
+      const double outside = mean_.Mean(c.k + 2.0, c.k + 7.0);
+      if (std::isnan(inside) || std::isnan(outside) || std::abs(inside - outside) < stepThreshold_) continue;
       outer = &c;
       break;
     }
@@ -193,16 +198,11 @@ class Reader {
     std::sort(candidates_.begin(), candidates_.end(), [](const Candidate& x, const Candidate& y) { return x.k > y.k; });
   }
 
-  double CalmLimit() const { return 1.6 * calm_ + 1.0; }
+  double CalmLimit() const { return 1.6 * calm_ + 2.0; }
 
   bool Smooth(double from, double to) const {
     const double r = roughSeries_.Median(from, to);
     return !std::isnan(r) && r <= CalmLimit();
-  }
-
-  bool LidLike(double from, double to) const {
-    const double m = mean_.Mean(from, to);
-    return Smooth(from, to) && !std::isnan(m) && std::abs(m - lid_) <= std::max(8.0, 0.04 * lid_);
   }
 
   // A calm stretch between two steps, darker than the lid, and something
@@ -248,6 +248,11 @@ class Reader {
       }
     }
     if (last < 0 || last >= n - 1) return r;  // the profile was not cut short
+    // Paper running off the page keeps its texture or its step from the lid
+    // right up to where the page ends; the bare lid does not.
+    const double level = mean_.Mean(last - 10.0, last);
+    const bool calm = Smooth(last - 10.0, last);
+    if (std::isnan(level) || (calm && (std::isnan(lid_) || std::abs(level - lid_) < stepThreshold_))) return r;
     r.pageEdge = true;
     r.found = true;
     r.offset = p_.OffsetOf(last);
@@ -263,6 +268,7 @@ class Reader {
   Series roughSeries_;
   double calm_ = 0.0;
   double gradThreshold_ = 0.0;
+  double stepThreshold_ = 0.0;
   double lid_ = kNaN;
   std::vector<Candidate> candidates_;
 };

@@ -32,6 +32,7 @@ struct SideReading {
 struct ReadOptions {
   double maxBandWidth = 14.0;   // widest shadow band, px
   double maxMarginWidth = 0.0;  // widest white margin looked for, px (0: none)
+  double pageNoise = 0.0;       // the page's noise (one value); 0: the profile's own
 };
 
 SideReading ReadSide(const AlignedProfile& profile, const ReadOptions& options);
