@@ -37,8 +37,8 @@ int main(int argc, char** argv) {
       const int dumpSide = getenv("DUMP") ? atoi(getenv("DUMP")) : -1;
       ropt.inspect = [dumpSide](int side, const Refine::AlignedProfile& p, const Refine::SideReading& r) {
         if (side != dumpSide) return;
-        std::printf("side %d slope %.5f noise %.2f lid %.1f lines %d found %d offset %.2f pol %d band %d(%.1f) margin %d(%.1f) %s\n",
-                    side, p.slope, p.noise, r.lid, p.lines, r.found, r.offset, r.polarity, r.band, r.bandWidth, r.margin, r.innerOffset, r.note.c_str());
+        std::printf("side %d slope %.5f noise %.2f lid %.1f/%.1f lines %d found %d offset %.2f pol %d band %d(%.1f) margin %d(%.1f) %s\n",
+                    side, p.slope, p.noise, r.lid, r.expectedLid, p.lines, r.found, r.offset, r.polarity, r.band, r.bandWidth, r.margin, r.innerOffset, r.note.c_str());
         for (int k = 0; k < p.Size(); ++k) std::printf("  s %6.1f mean %7.2f rough %6.2f\n", p.OffsetOf(k), p.mean[k], p.roughness[k]);
       };
       popt.refinement = ropt;

@@ -126,6 +126,10 @@ LidEstimate EstimateLid(const PageImage& page) {
     if (!FitSurface(blocks, weight, fitted)) break;
     out.surface = fitted;
   }
+  std::vector<double> residual;
+  for (size_t i = 0; i < blocks.size(); ++i)
+    if (weight[i] > 0.0) residual.push_back(std::abs(blocks[i].median - Evaluate(out.surface, blocks[i].u, blocks[i].v)));
+  out.residual = residual.empty() ? 0.0 : 1.4826 * Nth(residual, 0.5);
   double lo = 1e9, hi = -1e9;
   for (int i = 0; i <= 8; ++i) {
     for (int j = 0; j <= 8; ++j) {
@@ -136,6 +140,10 @@ LidEstimate EstimateLid(const PageImage& page) {
   }
   out.spread = hi - lo;
   return out;
+}
+
+double LidAt(const LidEstimate& lid, double u, double v) {
+  return Evaluate(lid.surface, std::clamp(u, 0.0, 1.0), std::clamp(v, 0.0, 1.0));
 }
 
 bool NeedsLevelling(double level, double spread) { return level < 150.0 || spread > 60.0; }

@@ -118,6 +118,7 @@ PageSurvey SurveyPage(const PageImage& page) {
   survey.lidLevel = lid.level;
   survey.lidSpread = lid.spread;
   survey.noise = lid.noise;
+  survey.lid = lid;
   for (int edge = 0; edge < 4; ++edge) survey.bedStrip[static_cast<size_t>(edge)] = FindBedStrip(g, edge, lid.level);
   return survey;
 }

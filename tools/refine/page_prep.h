@@ -12,6 +12,7 @@
 #include <vector>
 
 #include "refine/detector.h"
+#include "refine/lid_level.h"
 #include "refine/page_image.h"
 
 namespace Refine {
@@ -32,6 +33,7 @@ struct PageSurvey {
   double lidLevel = 0.0;          // typical gray of the bare lid
   double lidSpread = 0.0;         // how far the lid's brightness drifts across the page
   double noise = 0.0;             // sensor noise of one gray value
+  LidEstimate lid;                // the lid across the page
 };
 
 // Looks at the page's edges, lid and noise without changing anything.

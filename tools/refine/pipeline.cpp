@@ -35,6 +35,7 @@ PipelineResult DetectAndRefine(Detector& detector, const PageImage& page, const 
     start = std::chrono::steady_clock::now();
     const PreparedPage prepared = PreparePage(page, options.preparation);
     result.prepareSeconds = Since(start);
+    if (!refineOptions.lid && prepared.survey.lidLevel > 0.0) refineOptions.lid = prepared.survey.lid;
     if (!prepared.steps.empty()) {
       result.preparations = prepared.steps;
       result.filterRect = prepared.filterRect;

@@ -273,12 +273,19 @@ Refinement RefineOutline(const PageImage& page, const ModuleAnswer& answer, cons
     if (w.usable && w.profile.noise > 0.0 && (pageNoise == 0.0 || w.profile.noise < pageNoise))
       pageNoise = w.profile.noise;
   }
+  const LidEstimate lid = options.lid ? *options.lid : EstimateLid(page);
   ReadOptions readOptions;
   readOptions.maxMarginWidth = maxMargin;
   readOptions.pageNoise = pageNoise;
   for (int k = 0; k < 4; ++k) {
     SideWork& w = work[k];
     if (!w.usable) continue;
+    if (lid.level > 0.0) {
+      // The lid a little way beyond the middle of the side.
+      const Vec2 p = w.frame.At(0.5 * w.frame.length, 0.25 * reach);
+      readOptions.expectedLid = LidAt(lid, p.x / page.width, p.y / page.height);
+      readOptions.lidTolerance = std::max(6.0, 3.0 * lid.residual) + 2.5 * pageNoise;
+    }
     w.reading = ReadSide(w.profile, readOptions);
     if (!w.reading.found) {
       // The module's side is far off (a bed strip, dust, a picture edge taken
@@ -353,12 +360,13 @@ Refinement RefineOutline(const PageImage& page, const ModuleAnswer& answer, cons
     out.reason = "the refined sides do not meet in an outline";
     return out;
   }
-  // The refined outline must stay near the module's: each corner within the
-  // search reach (plus a margin's width) of the module's corner.
-  const double limit = reach * 1.5 + (margin ? maxMargin : 0.0);
+  // Each corner may move as far as its two sides moved, and a little more
+  // for their turn; further means two sides met at a glancing angle.
   for (int k = 0; k < 4; ++k) {
     const bool offPage = work[k].result.status == SideStatus::kPageEdge ||
                          work[(k + 3) % 4].result.status == SideStatus::kPageEdge;
+    const double limit = std::abs(work[k].result.shift) + std::abs(work[(k + 3) % 4].result.shift) +
+                         0.05 * across + 10.0 + (margin ? maxMargin : 0.0);
     if (!offPage && Distance((*corners)[k], answer.corners[k]) > limit) {
       out.status = RefineStatus::kKept;
       out.reason = "the refined outline strays too far from the module's";

@@ -16,6 +16,7 @@
 #include <string>
 
 #include "refine/geometry.h"
+#include "refine/lid_level.h"
 #include "refine/page_image.h"
 #include "refine/side_frame.h"
 
@@ -77,6 +78,8 @@ struct RefineOptions {
   // unset: the whole page.
   std::optional<SampleArea> area;
   bool findMargin = true;  // look for a white paper margin
+  // The lid across the page; unset: estimated from the page.
+  std::optional<LidEstimate> lid;
   // Called with each side's mean profile and its reading, for diagnostics.
   std::function<void(int side, const struct AlignedProfile&, const struct SideReading&)> inspect;
 };

@@ -104,6 +104,7 @@ class Reader {
     r.slope = p_.slope;
     r.tCentre = p_.tCentre;
     r.lid = lid_;
+    r.expectedLid = options_.expectedLid;
     r.noise = calm_;
     if (std::isnan(lid_)) {
       r.note = "no lid in reach";
@@ -119,6 +120,12 @@ class Reader {
       const double inside = mean_.Mean(c.k - 7.0, c.k - 2.0);
       const double outside = mean_.Mean(c.k + 2.0, c.k + 7.0);
       if (std::isnan(inside) || std::isnan(outside) || std::abs(inside - outside) < stepThreshold_) continue;
+      // Beyond the paper the lid comes back within a shadow's length; a pale
+      // stretch of picture does not reach the lid's level.
+      if (options_.expectedLid > 0.0) {
+        const double brightest = mean_.Max(c.k + 2.0, c.k + 40.0);
+        if (std::isnan(brightest) || brightest < options_.expectedLid - options_.lidTolerance) continue;
+      }
       outer = &c;
       break;
     }
@@ -252,7 +259,9 @@ class Reader {
     // right up to where the page ends; the bare lid does not.
     const double level = mean_.Mean(last - 10.0, last);
     const bool calm = Smooth(last - 10.0, last);
-    if (std::isnan(level) || (calm && (std::isnan(lid_) || std::abs(level - lid_) < stepThreshold_))) return r;
+    const double lid = options_.expectedLid > 0.0 ? options_.expectedLid : lid_;
+    const double tolerance = options_.expectedLid > 0.0 ? options_.lidTolerance : stepThreshold_;
+    if (std::isnan(level) || (calm && (std::isnan(lid) || std::abs(level - lid) < tolerance))) return r;
     r.pageEdge = true;
     r.found = true;
     r.offset = p_.OffsetOf(last);

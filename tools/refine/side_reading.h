@@ -25,6 +25,7 @@ struct SideReading {
   double innerOffset = 0.0;
   int innerPolarity = 0;
   double lid = 0.0;    // lid level outside the edge
+  double expectedLid = 0.0;  // the lid's level expected there from the whole page
   double noise = 0.0;  // noise of one profile value
   std::string note;    // what decided the reading
 };
@@ -33,6 +34,8 @@ struct ReadOptions {
   double maxBandWidth = 14.0;   // widest shadow band, px
   double maxMarginWidth = 0.0;  // widest white margin looked for, px (0: none)
   double pageNoise = 0.0;       // the page's noise (one value); 0: the profile's own
+  double expectedLid = 0.0;     // the lid's level beyond this side; 0: unknown
+  double lidTolerance = 15.0;   // how far the lid may differ from that, gray levels
 };
 
 SideReading ReadSide(const AlignedProfile& profile, const ReadOptions& options);
