@@ -129,6 +129,11 @@ class Reader {
       outer = &c;
       break;
     }
+    Candidate textureEnd;
+    if (outer == nullptr && TextureEnd(textureEnd)) {
+      outer = &textureEnd;
+      r.note = "paper edge where the picture's texture ends";
+    }
     if (outer == nullptr) {
       r.note = "no step with the lid outside";
       return PageEdgeOr(r);
@@ -196,6 +201,13 @@ class Reader {
       const double c = std::abs(grad_[static_cast<size_t>(k + 1)]);
       const double b = std::abs(g);
       if (std::isnan(a) || std::isnan(c) || b < a || b <= c) continue;
+      // A step stands out from the slope on at least one side of it; a
+      // ramp's wiggles have the same slope on both.
+      if (b < 1.6 * std::min(FlankSlope(k + 3, k + 8, 0), FlankSlope(k - 8, k - 3, 0))) continue;
+      // Nor is it a step when the page keeps sloping the same way inside it:
+      // that is a shadow ramp running on toward the paper.
+      const int polarity = g > 0.0 ? 1 : -1;
+      if (FlankSlope(k - 8, k - 3, polarity) >= 0.5 * b) continue;
       double shift = 0.0;
       const double denom = a - 2.0 * b + c;
       if (denom < 0.0) shift = std::clamp(0.5 * (a - c) / denom, -0.5, 0.5);
@@ -203,6 +215,42 @@ class Reader {
     }
     // Outermost first.
     std::sort(candidates_.begin(), candidates_.end(), [](const Candidate& x, const Candidate& y) { return x.k > y.k; });
+  }
+
+  // Median gradient over an index range (0 outside the profile): its size
+  // when polarity is 0, else its part in the polarity's direction.
+  double FlankSlope(int from, int to, int polarity) const {
+    std::vector<double> v;
+    for (int k = std::max(from, 0); k <= std::min(to, p_.Size() - 1); ++k) {
+      const double g = grad_[static_cast<size_t>(k)];
+      if (!std::isnan(g)) v.push_back(polarity == 0 ? std::abs(g) : polarity * g);
+    }
+    if (v.empty()) return 0.0;
+    std::nth_element(v.begin(), v.begin() + static_cast<std::ptrdiff_t>(v.size() / 2), v.end());
+    return v[v.size() / 2];
+  }
+
+  // Where the picture's texture ends and a calm page begins that reaches the
+  // lid: the paper's edge when no clean step marks it (a soft shadow ramp).
+  bool TextureEnd(Candidate& edge) const {
+    const int n = p_.Size();
+    for (int k = n - 8; k >= 8; --k) {
+      if (!Smooth(k + 1.0, k + 6.0) || Smooth(k - 6.0, k - 1.0)) continue;
+      if (options_.expectedLid > 0.0) {
+        const double brightest = mean_.Max(k + 1.0, k + 40.0);
+        if (std::isnan(brightest) || brightest < options_.expectedLid - options_.lidTolerance) continue;
+      }
+      int best = k;
+      for (int j = k - 3; j <= k + 3; ++j) {
+        const double g = grad_[static_cast<size_t>(j)];
+        if (!std::isnan(g) && std::abs(g) > std::abs(grad_[static_cast<size_t>(best)])) best = j;
+      }
+      const double g = grad_[static_cast<size_t>(best)];
+      if (std::isnan(g) || std::abs(g) < gradThreshold_) return false;
+      edge = {static_cast<double>(best), std::abs(g), g > 0.0 ? 1 : -1};
+      return true;
+    }
+    return false;
   }
 
   double CalmLimit() const { return 1.6 * calm_ + 2.0; }
