@@ -1,0 +1,132 @@
+// Command-line parsing with CLI11.
+#include "cli.h"
+
+#include <CLI/CLI.hpp>
+
+#include "exit_codes.h"
+#include "image_saver.h"
+#include "page_loader.h"
+
+#ifndef FRINGE_VERSION
+#define FRINGE_VERSION "0"
+#endif
+
+namespace Fringe {
+
+namespace {
+
+constexpr const char* kDescription =
+    "fringe finds the photograph on flatbed scans: its four corners, the angle it is turned\n"
+    "by and a confidence, with the Fringe module run exactly as the host runs it. It can\n"
+    "also draw the outline on the page and cut the photo out straightened.";
+
+constexpr const char* kFooter = R"(Coordinates:
+  Corners are (x, y) pixel positions in the file's stored pixels (x the column, y the row,
+  counted from the top-left pixel; an EXIF orientation is not applied), clockwise from the
+  photo's top-left corner. The angle is in degrees as the module publishes it: positive when
+  the photo is turned counter-clockwise on the page.
+
+Inputs:
+  Files of any format libvips reads (PNG, JPEG, TIFF, WebP, ...), 8- or 16-bit, gray, RGB,
+  palette or CMYK, with or without alpha. Folders are searched recursively for image files
+  (hidden names skipped, each folder once however links loop). Gray pages run as grayscale
+  documents, everything else as RGB; alpha becomes the document's transparency.
+
+Output:
+  One line per page on standard output, in the order the pages were named; --json gives
+  JSON Lines: {"file", "status": "found"|"not_found"|"error", "width", "height",
+  "mode": "gray"|"rgb", "alpha", "format", "confidence", "angle", "corners": [[x,y] x4],
+  "outline", "photo", "times_ms": {"decode","detect","write"}, "error", "error_kind"}.
+  The angle reads back to the exact double the module published; it is 0 when no photo
+  was found. Written files are <name>.outline.<ext> and <name>.photo.<ext> below --output,
+  mirroring the input folders. Errors go to standard error, naming the file.
+
+Exit codes:
+  0   every page had a photo
+  1   some page had no photo
+  2   some input could not be read, decoded, or was refused (too large, not an image)
+  64  wrong command line
+  70  internal failure: the module could not be loaded or run, a worker process died
+  73  an output file could not be written
+  A batch exits with the most serious of its pages' codes.
+
+Examples:
+  fringe detect scan.jpg
+  fringe all scan.jpg -o out
+  fringe crop --json -j 4 --results done.jsonl scans/ -o photos)";
+
+void AddCommon(CLI::App* sub, Options& o) {
+  sub->add_option("inputs", o.inputs, "Image files or folders")->required();
+  sub->add_flag("--json", o.json, "Print one JSON object per page (JSON Lines)");
+  sub->add_option("-j,--jobs", o.jobs, "Pages processed in parallel (default: one per core)")
+      ->check(CLI::Range(1, 1024));
+  sub->add_option("--results", o.resultsFile,
+                  "Append each page's JSON result to FILE; pages already in it are skipped, "
+                  "so an interrupted batch resumes where it stopped");
+  sub->add_flag("-q,--quiet", o.quiet, "No progress or summary on standard error");
+  sub->add_option("--module", o.modulePath, "The module file (default: Fringe.9zf next to fringe)");
+  sub->add_option("--max-side", o.page.maxSide,
+                  "Detect on a copy no larger than N pixels a side; corners are scaled back. "
+                  "Needed for pages above 32767 pixels a side")
+      ->check(CLI::Range(27, kModuleMaxSide));
+  sub->add_option("--max-pixels", o.page.maxPixels,
+                  "Refuse files whose header promises more pixels than this")
+      ->capture_default_str()
+      ->check(CLI::Range(uint64_t{1}, uint64_t{1} << 40));
+}
+
+void AddWriting(CLI::App* sub, Options& o, bool outline, bool photo) {
+  sub->add_option("-o,--output", o.page.outputDir, "Folder for the written files")->required();
+  if (outline) {
+    sub->add_option("--outline-format", o.page.outlineFormat, "png or jpg")
+        ->capture_default_str()
+        ->check(CLI::IsMember({"png", "jpg"}));
+  }
+  if (photo) {
+    sub->add_option("--format", o.page.photoFormat,
+                    "Photo file format: png, jpg, tif or webp (default: the input's own, "
+                    "PNG where it cannot be written)")
+        ->check(CLI::IsMember({"png", "jpg", "tif", "webp"}));
+    sub->add_option("--margin", o.page.margin, "Pixels kept around the photo on every side")
+        ->capture_default_str()
+        ->check(CLI::Range(0, 10000));
+  }
+  sub->add_option("--quality", o.page.quality, "JPEG and WebP quality")
+      ->capture_default_str()
+      ->check(CLI::Range(1, 100));
+}
+
+}  // namespace
+
+std::optional<Options> ParseCommandLine(int argc, char** argv, int& exitCode) {
+  Options o;
+  CLI::App app(kDescription, "fringe");
+  app.set_version_flag("--version", std::string("fringe ") + FRINGE_VERSION);
+  app.require_subcommand(1);
+
+  CLI::App* detect =
+      app.add_subcommand("detect", "Print each page's corners, angle and confidence");
+  CLI::App* draw = app.add_subcommand("draw", "Also write each page with the outline drawn on it");
+  CLI::App* crop = app.add_subcommand("crop", "Also write each photo cut out and straightened");
+  CLI::App* all = app.add_subcommand("all", "Write both the outline picture and the photo");
+  for (CLI::App* sub : {detect, draw, crop, all}) AddCommon(sub, o);
+  AddWriting(draw, o, true, false);
+  AddWriting(crop, o, false, true);
+  AddWriting(all, o, true, true);
+  // Set last so that the subcommands' help stays short.
+  app.footer(kFooter);
+
+  try {
+    app.parse(argc, argv);
+  } catch (const CLI::ParseError& e) {
+    const int rc = app.exit(e);
+    exitCode = rc == 0 ? kExitOk : kExitUsage;
+    return std::nullopt;
+  }
+  for (CLI::App* sub : app.get_subcommands()) o.command = sub->get_name();
+  o.page.outputs.outline = o.command == "draw" || o.command == "all";
+  o.page.outputs.photo = o.command == "crop" || o.command == "all";
+  return o;
+}
+
+}  // namespace Fringe
