@@ -18,6 +18,8 @@
 #include "accuracy/page_io.h"
 #include "accuracy/report.h"
 #include "accuracy/run.h"
+#include "refine/aligned_profile.h"
+#include "refine/side_reading.h"
 #include "synth/hard_pages.h"
 
 namespace {
@@ -38,6 +40,7 @@ struct Settings {
   bool byKind = false;
   bool perPage = false;
   std::string jsonFile;
+  std::string inspect;  // page name, to print its sides' profiles
 };
 
 std::vector<Synth::HardPageSpec> SelectSpecs(const Settings& s) {
@@ -66,6 +69,16 @@ nlohmann::ordered_json ScoreJson(const Accuracy::Score& s) {
           {"corner_errors", s.cornerError}, {"angle_error", s.angleError}};
 }
 
+// Diagnostics: a side's typical profile and how it was read.
+void PrintSide(int side, const Refine::AlignedProfile& p, const Refine::SideReading& r) {
+  std::printf("side %d (%s): %s; edge at %.2f, polarity %+d, band %.1f, margin %s at %.2f; lid %.1f (expected %.1f), "
+              "noise %.2f, slope %.5f\n",
+              side, Refine::kSideNames[static_cast<size_t>(side)], r.note.c_str(), r.offset, r.polarity, r.bandWidth,
+              r.margin ? "yes" : "no", r.innerOffset, r.lid, r.expectedLid, r.noise, p.slope);
+  for (int k = 0; k < p.Size(); ++k)
+    std::printf("  %7.1f %8.2f %6.2f\n", p.OffsetOf(k), p.mean[static_cast<size_t>(k)], p.roughness[static_cast<size_t>(k)]);
+}
+
 int Run(const Settings& s) {
   std::unique_ptr<Refine::Detector> detector;
   if (s.inMemory) {
@@ -83,7 +96,9 @@ int Run(const Settings& s) {
     if (!json) throw std::runtime_error(s.jsonFile + ": cannot write");
   }
   auto score = [&](const Accuracy::PageCase& c) {
-    outcomes.push_back(Accuracy::RunCase(*detector, c, options));
+    Refine::PipelineOptions pageOptions = options;
+    if (c.name == s.inspect) pageOptions.refinement.inspect = PrintSide;
+    outcomes.push_back(Accuracy::RunCase(*detector, c, pageOptions));
     const Accuracy::PageOutcome& o = outcomes.back();
     if (s.perPage) std::fprintf(stderr, "%s\n", Accuracy::PageLine(o).c_str());
     if (json.is_open()) {
@@ -144,6 +159,7 @@ int main(int argc, char** argv) {
   app.add_flag("--by-kind", s.byKind, "Add a table kind by kind");
   app.add_flag("--per-page", s.perPage, "A line per page on standard error");
   app.add_option("--json", s.jsonFile, "Write one JSON object per page to this file");
+  app.add_option("--inspect", s.inspect, "Print the profiles across each side of the named page (diagnostics)");
   try {
     app.parse(argc, argv);
     if (s.generate == 0 && s.pages.empty()) throw CLI::RequiredError("--generate or --pages");

@@ -263,7 +263,14 @@ class Reader {
   // A calm stretch between two steps, darker than the lid, and something
   // different inside it.
   bool IsBand(double innerK, double outerK) const {
-    if (!Smooth(innerK + 1.0, outerK - 1.0)) return false;
+    // Calm, or at least far calmer than the picture inside it (a compressed
+    // page rings inside a narrow band).
+    const double bandRough = roughSeries_.Median(innerK + 1.0, outerK - 1.0);
+    const double insideRough = roughSeries_.Median(innerK - 8.0, innerK - 2.0);
+    if (std::isnan(bandRough)) return false;
+    const bool calm = bandRough <= CalmLimit() ||
+                      (bandRough <= 1.6 * CalmLimit() && !std::isnan(insideRough) && bandRough <= 0.6 * insideRough);
+    if (!calm) return false;
     const double level = mean_.Mean(innerK + 1.0, outerK - 1.0);
     if (std::isnan(level) || level > lid_ - std::max(10.0, 0.08 * lid_)) return false;
     const double inside = mean_.Mean(innerK - 6.0, innerK - 2.0);

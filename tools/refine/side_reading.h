@@ -31,7 +31,7 @@ struct SideReading {
 };
 
 struct ReadOptions {
-  double maxBandWidth = 14.0;   // widest shadow band, px
+  double maxBandWidth = 12.0;   // widest shadow band, px
   double maxMarginWidth = 0.0;  // widest white margin looked for, px (0: none)
   double pageNoise = 0.0;       // the page's noise (one value); 0: the profile's own
   double expectedLid = 0.0;     // the lid's level beyond this side; 0: unknown
