@@ -14,15 +14,19 @@ namespace {
 
 constexpr double kPi = 3.14159265358979323846;
 constexpr std::array<std::string_view, static_cast<int>(HardKind::kCount)> kKindNames = {
-    "plain",      "white-border", "shadow-band", "shadow-ramp", "sheared",
-    "bed-strip",  "grey-lid",     "uneven-lid",  "low-contrast", "dark-photo",
-    "heavy-noise", "jpeg",        "off-page",    "dust",        "blank"};
+    "plain",       "white-border", "shadow-band", "shadow-ramp",  "sheared",
+    "bed-strip",   "grey-lid",     "uneven-lid",  "low-contrast", "dark-photo",
+    "heavy-noise", "jpeg",         "off-page",    "dust",         "blank"};
 
 using Corners = std::array<std::array<double, 2>, 4>;
 
-double Clamp01(double v) { return std::clamp(v, 0.0, 1.0); }
+double Clamp01(double v) {
+  return std::clamp(v, 0.0, 1.0);
+}
 
-uint8_t ToByte(double value) { return static_cast<uint8_t>(std::clamp(value, 0.0, 255.0) + 0.5); }
+uint8_t ToByte(double value) {
+  return static_cast<uint8_t>(std::clamp(value, 0.0, 255.0) + 0.5);
+}
 
 // Uniform draws on top of the generator's random source.
 class Draw {
@@ -130,10 +134,14 @@ std::optional<Corners> ClipToPage(const Corners& q, double width, double height,
     const double t = (y - a[1]) / (b[1] - a[1]);
     return std::array<double, 2>{a[0] + t * (b[0] - a[0]), y};
   };
-  clip([](const auto& p) { return p[0] >= 0.0; }, [&](const auto& a, const auto& b) { return atX(a, b, 0.0); });
-  clip([&](const auto& p) { return p[0] <= width; }, [&](const auto& a, const auto& b) { return atX(a, b, width); });
-  clip([](const auto& p) { return p[1] >= 0.0; }, [&](const auto& a, const auto& b) { return atY(a, b, 0.0); });
-  clip([&](const auto& p) { return p[1] <= height; }, [&](const auto& a, const auto& b) { return atY(a, b, height); });
+  clip([](const auto& p) { return p[0] >= 0.0; },
+       [&](const auto& a, const auto& b) { return atX(a, b, 0.0); });
+  clip([&](const auto& p) { return p[0] <= width; },
+       [&](const auto& a, const auto& b) { return atX(a, b, width); });
+  clip([](const auto& p) { return p[1] >= 0.0; },
+       [&](const auto& a, const auto& b) { return atY(a, b, 0.0); });
+  clip([&](const auto& p) { return p[1] <= height; },
+       [&](const auto& a, const auto& b) { return atY(a, b, height); });
   if (poly.size() != 4) return std::nullopt;
   const double a = angleDegrees * kPi / 180.0;
   size_t first = 0;
@@ -156,8 +164,10 @@ std::optional<Corners> ClipToPage(const Corners& q, double width, double height,
 std::array<double, 2> Reach(const HardPageSpec& s) {
   const double a = s.angleDegrees * kPi / 180.0;
   const double extra = 0.5 * s.paperHeight * std::abs(std::tan(s.shearDegrees * kPi / 180.0));
-  return {std::abs(std::cos(a)) * s.paperWidth * 0.5 + std::abs(std::sin(a)) * s.paperHeight * 0.5 + extra,
-          std::abs(std::sin(a)) * s.paperWidth * 0.5 + std::abs(std::cos(a)) * s.paperHeight * 0.5 + extra};
+  return {std::abs(std::cos(a)) * s.paperWidth * 0.5 + std::abs(std::sin(a)) * s.paperHeight * 0.5 +
+              extra,
+          std::abs(std::sin(a)) * s.paperWidth * 0.5 + std::abs(std::cos(a)) * s.paperHeight * 0.5 +
+              extra};
 }
 
 struct Speck {
@@ -172,7 +182,8 @@ class Picture {
         width_(width),
         height_(height),
         broad_(width, height, 90.0, draw.Source()),
-        blobs_{ValueNoise(width, height, 47.0, draw.Source()), ValueNoise(width, height, 39.0, draw.Source()),
+        blobs_{ValueNoise(width, height, 47.0, draw.Source()),
+               ValueNoise(width, height, 39.0, draw.Source()),
                ValueNoise(width, height, 55.0, draw.Source())},
         detail_(width, height, 5.0, draw.Source()),
         horizon_(draw.Uniform(0.25, 0.6) * height),
@@ -230,16 +241,18 @@ void Validate(const HardPageSpec& s) {
   if (s.width < 32 || s.height < 32 || s.width > 32767 || s.height > 32767)
     throw std::invalid_argument("hard page size out of range: " + std::to_string(s.width) + " x " +
                                 std::to_string(s.height));
-  const double values[] = {s.centerX, s.centerY, s.paperWidth, s.paperHeight, s.angleDegrees,
-                           s.shearDegrees, s.border, s.noise, s.edgeSoftness, s.lidLevel};
+  const double values[] = {s.centerX,      s.centerY, s.paperWidth, s.paperHeight,  s.angleDegrees,
+                           s.shearDegrees, s.border,  s.noise,      s.edgeSoftness, s.lidLevel};
   for (double v : values)
     if (!std::isfinite(v)) throw std::invalid_argument("hard page spec has a non-finite value");
   if (s.hasPhoto && (s.paperWidth < 8.0 || s.paperHeight < 8.0))
     throw std::invalid_argument("hard page paper is too small");
-  if (s.hasPhoto && (s.border < 0.0 || 2.0 * s.border >= std::min(s.paperWidth, s.paperHeight) - 4.0))
+  if (s.hasPhoto &&
+      (s.border < 0.0 || 2.0 * s.border >= std::min(s.paperWidth, s.paperHeight) - 4.0))
     throw std::invalid_argument("hard page border does not fit the paper");
   if (std::abs(s.shearDegrees) > 5.0) throw std::invalid_argument("hard page shear is too large");
-  if (s.noise < 0.0 || s.edgeSoftness < 0.25) throw std::invalid_argument("hard page noise or softness out of range");
+  if (s.noise < 0.0 || s.edgeSoftness < 0.25)
+    throw std::invalid_argument("hard page noise or softness out of range");
 }
 
 }  // namespace
@@ -365,8 +378,10 @@ HardPageSpec MakeHardPageSpec(HardKind kind, uint32_t seed, int width, int heigh
     // Far enough over that the outer side lies wholly off the page.
     const double sine = std::abs(std::sin(s.angleDegrees * kPi / 180.0));
     double over = draw.Uniform(0.08, 0.25);
-    if (first == 0 || first == 2) over = std::max(over, (s.paperWidth * sine + 10.0) / s.paperHeight);
-    if (first == 1 || first == 3) over = std::max(over, (s.paperHeight * sine + 10.0) / s.paperWidth);
+    if (first == 0 || first == 2)
+      over = std::max(over, (s.paperWidth * sine + 10.0) / s.paperHeight);
+    if (first == 1 || first == 3)
+      over = std::max(over, (s.paperHeight * sine + 10.0) / s.paperWidth);
     if (first == 0) s.centerY = reach[1] - over * s.paperHeight;
     if (first == 1) s.centerX = width - reach[0] + over * s.paperWidth;
     if (first == 2) s.centerY = height - reach[1] + over * s.paperHeight;
@@ -434,13 +449,14 @@ HardPage GenerateHardPage(const HardPageSpec& s) {
     for (int i = 0; i < s.dustCount; ++i) {
       const double along = draw.Uniform(0.02, 0.98) * side.length;
       const double outward = s.dustDistance + draw.Uniform(-6.0, 6.0);
-      specks.push_back({side.ax + side.ux * along - side.nx * outward, side.ay + side.uy * along - side.ny * outward,
-                        draw.Uniform(0.8, 2.5), draw.Uniform(40.0, 150.0)});
+      specks.push_back({side.ax + side.ux * along - side.nx * outward,
+                        side.ay + side.uy * along - side.ny * outward, draw.Uniform(0.8, 2.5),
+                        draw.Uniform(40.0, 150.0)});
     }
   } else if (!s.hasPhoto && s.kind == HardKind::kBlank && draw.Chance(0.3)) {
     for (int i = 0; i < 25; ++i)
-      specks.push_back({draw.Uniform(20.0, w - 20.0), draw.Uniform(20.0, h - 20.0), draw.Uniform(0.8, 2.5),
-                        draw.Uniform(40.0, 150.0)});
+      specks.push_back({draw.Uniform(20.0, w - 20.0), draw.Uniform(20.0, h - 20.0),
+                        draw.Uniform(0.8, 2.5), draw.Uniform(40.0, 150.0)});
   }
 
   static constexpr double kLidTint[3] = {0.0, -2.0, -6.0};
@@ -463,9 +479,11 @@ HardPage GenerateHardPage(const HardPageSpec& s) {
     for (int x = 0; x < s.width; ++x) {
       const double px = x + 0.5;
       // The lid: level, a broad drift for uneven lids, fine grain, hinge shade.
-      const double drift = Clamp01(0.5 + 0.25 * (slopeX * (px / w - 0.5) + slopeY * (py / h - 0.5)) +
-                                   0.35 * broadRow[static_cast<size_t>(x)]);
-      double lid = s.lidLevel * (1.0 - s.lidUnevenness * drift) + 1.5 * grainRow[static_cast<size_t>(x)];
+      const double drift =
+          Clamp01(0.5 + 0.25 * (slopeX * (px / w - 0.5) + slopeY * (py / h - 0.5)) +
+                  0.35 * broadRow[static_cast<size_t>(x)]);
+      double lid =
+          s.lidLevel * (1.0 - s.lidUnevenness * drift) + 1.5 * grainRow[static_cast<size_t>(x)];
       lid *= hinge;
 
       double coverPaper = 0.0;
@@ -489,7 +507,8 @@ HardPage GenerateHardPage(const HardPageSpec& s) {
               dark += sh.rampDepth * std::exp(-e / sh.rampLength);
             shade *= 1.0 - std::min(dark, 0.9);
           }
-          if (s.border > 0.0) coverPicture *= Clamp01(0.5 + pictureSides[k].Inside(px, py) / s.edgeSoftness);
+          if (s.border > 0.0)
+            coverPicture *= Clamp01(0.5 + pictureSides[k].Inside(px, py) / s.edgeSoftness);
         }
         if (s.border <= 0.0) coverPicture = coverPaper;
         lid *= shade;
@@ -553,7 +572,8 @@ std::vector<HardPageSpec> HardPageSet(int count, uint32_t seed) {
   for (int i = 0; i < count; ++i) {
     const auto kind = static_cast<HardKind>(i % kinds);
     const auto& size = kSizes[static_cast<size_t>((i / kinds) % static_cast<int>(kSizes.size()))];
-    specs.push_back(MakeHardPageSpec(kind, seed * 7919U + static_cast<uint32_t>(i), size[0], size[1]));
+    specs.push_back(
+        MakeHardPageSpec(kind, seed * 7919U + static_cast<uint32_t>(i), size[0], size[1]));
   }
   return specs;
 }

@@ -21,21 +21,21 @@
 namespace Synth {
 
 enum class HardKind : int {
-  kPlain = 0,      // a clean print on a white lid
-  kWhiteBorder,    // a print with a white paper margin round the picture
-  kShadowBand,     // a dark band just outside one or two sides
-  kShadowRamp,     // a soft shadow ramp outside a side
-  kSheared,        // left and right sides turned 0.1 to 0.2 degrees further
-  kBedStrip,       // a dark strip of the scanner bed along a page edge
-  kGreyLid,        // a grey lid, darker than the paper
-  kUnevenLid,      // a lid whose brightness drifts across the page
-  kLowContrast,    // a faded or snowy photo, edges close to the lid
-  kDarkPhoto,      // a dark photo
-  kHeavyNoise,     // strong sensor noise
-  kJpeg,           // to be stored as a low-quality JPEG by whoever writes it
-  kOffPage,        // the photo runs over one page edge
-  kDust,           // a line of dust specks near one side
-  kBlank,          // no photo at all
+  kPlain = 0,    // a clean print on a white lid
+  kWhiteBorder,  // a print with a white paper margin round the picture
+  kShadowBand,   // a dark band just outside one or two sides
+  kShadowRamp,   // a soft shadow ramp outside a side
+  kSheared,      // left and right sides turned 0.1 to 0.2 degrees further
+  kBedStrip,     // a dark strip of the scanner bed along a page edge
+  kGreyLid,      // a grey lid, darker than the paper
+  kUnevenLid,    // a lid whose brightness drifts across the page
+  kLowContrast,  // a faded or snowy photo, edges close to the lid
+  kDarkPhoto,    // a dark photo
+  kHeavyNoise,   // strong sensor noise
+  kJpeg,         // to be stored as a low-quality JPEG by whoever writes it
+  kOffPage,      // the photo runs over one page edge
+  kDust,         // a line of dust specks near one side
+  kBlank,        // no photo at all
   kCount
 };
 
@@ -72,12 +72,12 @@ struct HardPageSpec {
   double border = 0.0;        // white margin between paper edge and picture, px
   double paperWhite = 248.0;  // brightness of the paper margin
   PictureTone tone = PictureTone::kNormal;
-  bool innerLine = false;  // a straight dark line in the picture parallel to a side
+  bool innerLine = false;     // a straight dark line in the picture parallel to a side
   double edgeSoftness = 1.0;  // width of the antialiased transitions, px
 
   double lidLevel = 242.0;
-  double lidUnevenness = 0.0;  // fraction of brightness lost at the darkest spot
-  double hingeShadow = 0.0;    // depth of a soft shade along the top edge
+  double lidUnevenness = 0.0;           // fraction of brightness lost at the darkest spot
+  double hingeShadow = 0.0;             // depth of a soft shade along the top edge
   std::array<SideShadow, 4> shadows{};  // top, right, bottom, left side of the paper
 
   int bedStripSide = -1;  // page edge 0 top, 1 right, 2 bottom, 3 left; -1 none

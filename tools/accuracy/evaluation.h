@@ -15,9 +15,9 @@ namespace Accuracy {
 // covers [x, x + 1) x [y, y + 1).
 struct Truth {
   bool photo = false;
-  Refine::Quad corners{};          // the paper's outline
-  std::optional<double> angle;     // degrees, the module's sign; from the corners when unset
-  std::string kind;                // what makes the page hard
+  Refine::Quad corners{};       // the paper's outline
+  std::optional<double> angle;  // degrees, the module's sign; from the corners when unset
+  std::string kind;             // what makes the page hard
 };
 
 struct Answer {
@@ -28,9 +28,9 @@ struct Answer {
 
 struct Score {
   bool photoPage = false;
-  bool reported = false;           // the answer reports a photo
-  bool found = false;              // photo page, reported, all corners within the limit
-  bool falseAlarm = false;         // blank page, photo reported
+  bool reported = false;    // the answer reports a photo
+  bool found = false;       // photo page, reported, all corners within the limit
+  bool falseAlarm = false;  // blank page, photo reported
   std::array<double, 4> cornerError{};
   double maxCornerError = 0.0;
   double angleError = 0.0;

@@ -55,7 +55,8 @@ std::vector<Synth::HardPageSpec> SelectSpecs(const Settings& s) {
   std::vector<Synth::HardPageSpec> specs;
   // Walk the cycling set until enough pages of the wanted kinds are chosen.
   const int kinds = static_cast<int>(Synth::HardKind::kCount);
-  const int span = wanted.empty() ? s.generate : s.generate * kinds / static_cast<int>(wanted.size()) + kinds;
+  const int span =
+      wanted.empty() ? s.generate : s.generate * kinds / static_cast<int>(wanted.size()) + kinds;
   for (const auto& spec : Synth::HardPageSet(span, s.seed)) {
     if (!wanted.empty() && !wanted.count(spec.kind)) continue;
     if (static_cast<int>(specs.size()) == s.generate) break;
@@ -65,18 +66,24 @@ std::vector<Synth::HardPageSpec> SelectSpecs(const Settings& s) {
 }
 
 nlohmann::ordered_json ScoreJson(const Accuracy::Score& s) {
-  return {{"reported", s.reported}, {"found", s.found}, {"max_corner_error", s.maxCornerError},
-          {"corner_errors", s.cornerError}, {"angle_error", s.angleError}};
+  return {{"reported", s.reported},
+          {"found", s.found},
+          {"max_corner_error", s.maxCornerError},
+          {"corner_errors", s.cornerError},
+          {"angle_error", s.angleError}};
 }
 
 // Diagnostics: a side's typical profile and how it was read.
 void PrintSide(int side, const Refine::AlignedProfile& p, const Refine::SideReading& r) {
-  std::printf("side %d (%s): %s; edge at %.2f, polarity %+d, band %.1f, margin %s at %.2f; lid %.1f (expected %.1f), "
-              "noise %.2f, slope %.5f\n",
-              side, Refine::kSideNames[static_cast<size_t>(side)], r.note.c_str(), r.offset, r.polarity, r.bandWidth,
-              r.margin ? "yes" : "no", r.innerOffset, r.lid, r.expectedLid, r.noise, p.slope);
+  std::printf(
+      "side %d (%s): %s; edge at %.2f, polarity %+d, band %.1f, margin %s at %.2f; lid %.1f "
+      "(expected %.1f), "
+      "noise %.2f, slope %.5f\n",
+      side, Refine::kSideNames[static_cast<size_t>(side)], r.note.c_str(), r.offset, r.polarity,
+      r.bandWidth, r.margin ? "yes" : "no", r.innerOffset, r.lid, r.expectedLid, r.noise, p.slope);
   for (int k = 0; k < p.Size(); ++k)
-    std::printf("  %7.1f %8.2f %6.2f\n", p.OffsetOf(k), p.mean[static_cast<size_t>(k)], p.roughness[static_cast<size_t>(k)]);
+    std::printf("  %7.1f %8.2f %6.2f\n", p.OffsetOf(k), p.mean[static_cast<size_t>(k)],
+                p.roughness[static_cast<size_t>(k)]);
 }
 
 int Run(const Settings& s) {
@@ -84,7 +91,8 @@ int Run(const Settings& s) {
   if (s.inMemory) {
     detector = std::make_unique<Accuracy::MemoryDetector>();
   } else {
-    detector = std::make_unique<Accuracy::ModuleDetector>(s.module.empty() ? Accuracy::ModuleNextToProgram() : s.module);
+    detector = std::make_unique<Accuracy::ModuleDetector>(
+        s.module.empty() ? Accuracy::ModuleNextToProgram() : s.module);
   }
   Refine::PipelineOptions options;
   options.prepare = !s.noPrepare;
@@ -102,10 +110,14 @@ int Run(const Settings& s) {
     const Accuracy::PageOutcome& o = outcomes.back();
     if (s.perPage) std::fprintf(stderr, "%s\n", Accuracy::PageLine(o).c_str());
     if (json.is_open()) {
-      nlohmann::ordered_json j{{"page", o.name},           {"kind", o.kind},
-                               {"module", ScoreJson(o.raw)}, {"refined", ScoreJson(o.refined)},
-                               {"status", o.status},       {"preparations", o.preparations},
-                               {"times_ms", {{"detect", o.detectMs}, {"prepare", o.prepareMs}, {"refine", o.refineMs}}}};
+      nlohmann::ordered_json j{
+          {"page", o.name},
+          {"kind", o.kind},
+          {"module", ScoreJson(o.raw)},
+          {"refined", ScoreJson(o.refined)},
+          {"status", o.status},
+          {"preparations", o.preparations},
+          {"times_ms", {{"detect", o.detectMs}, {"prepare", o.prepareMs}, {"refine", o.refineMs}}}};
       json << j.dump() << '\n';
     }
   };
@@ -137,29 +149,42 @@ int Run(const Settings& s) {
 
 int main(int argc, char** argv) {
   CLI::App app{
-      "fringe-accuracy: the module's raw answers and the refined outlines, side by side, on pages whose\n"
-      "true outline is known. Pages are generated (--generate N: the hard page set, every kind in turn)\n"
-      "or read from a folder (--pages DIR: each image with NAME.truth.json beside it). A photo is found\n"
-      "when all four corners lie within 10 px of the truth; corner errors are taken over every page\n"
+      "fringe-accuracy: the module's raw answers and the refined outlines, side by side, on pages "
+      "whose\n"
+      "true outline is known. Pages are generated (--generate N: the hard page set, every kind in "
+      "turn)\n"
+      "or read from a folder (--pages DIR: each image with NAME.truth.json beside it). A photo is "
+      "found\n"
+      "when all four corners lie within 10 px of the truth; corner errors are taken over every "
+      "page\n"
       "where a photo was reported. Prints a Markdown table.",
       "fringe-accuracy"};
   Settings s;
-  auto* generate = app.add_option("--generate", s.generate, "Generate N hard pages")->check(CLI::Range(1, 100000));
-  auto* pages = app.add_option("--pages", s.pages, "Score the pages in this folder")->check(CLI::ExistingDirectory);
+  auto* generate = app.add_option("--generate", s.generate, "Generate N hard pages")
+                       ->check(CLI::Range(1, 100000));
+  auto* pages = app.add_option("--pages", s.pages, "Score the pages in this folder")
+                    ->check(CLI::ExistingDirectory);
   generate->excludes(pages);
   app.add_option("--seed", s.seed, "Seed of the generated set")->needs(generate);
-  app.add_option("--kinds", s.kinds, "Only these kinds, comma separated: plain, white-border, shadow-band, "
-                                     "shadow-ramp, sheared, bed-strip, grey-lid, uneven-lid, low-contrast, dark-photo, "
-                                     "heavy-noise, jpeg, off-page, dust, blank")
+  app.add_option("--kinds", s.kinds,
+                 "Only these kinds, comma separated: plain, white-border, shadow-band, "
+                 "shadow-ramp, sheared, bed-strip, grey-lid, uneven-lid, low-contrast, dark-photo, "
+                 "heavy-noise, jpeg, off-page, dust, blank")
       ->needs(generate);
-  app.add_option("--write", s.write, "Also write the generated pages and truth files into this folder")->needs(generate);
-  auto* module = app.add_option("--module", s.module, "Module file (default: Fringe.9zf next to this program)");
-  app.add_flag("--in-memory", s.inMemory, "Run the analysis in memory instead of the module")->excludes(module);
-  app.add_flag("--no-prepare", s.noPrepare, "Refine the module's first answer only; no page preparation");
+  app.add_option("--write", s.write,
+                 "Also write the generated pages and truth files into this folder")
+      ->needs(generate);
+  auto* module = app.add_option("--module", s.module,
+                                "Module file (default: Fringe.9zf next to this program)");
+  app.add_flag("--in-memory", s.inMemory, "Run the analysis in memory instead of the module")
+      ->excludes(module);
+  app.add_flag("--no-prepare", s.noPrepare,
+               "Refine the module's first answer only; no page preparation");
   app.add_flag("--by-kind", s.byKind, "Add a table kind by kind");
   app.add_flag("--per-page", s.perPage, "A line per page on standard error");
   app.add_option("--json", s.jsonFile, "Write one JSON object per page to this file");
-  app.add_option("--inspect", s.inspect, "Print the profiles across each side of the named page (diagnostics)");
+  app.add_option("--inspect", s.inspect,
+                 "Print the profiles across each side of the named page (diagnostics)");
   try {
     app.parse(argc, argv);
     if (s.generate == 0 && s.pages.empty()) throw CLI::RequiredError("--generate or --pages");

@@ -9,13 +9,15 @@
 
 namespace Accuracy {
 
-ModuleDetector::ModuleDetector(const std::string& modulePath) : module_(Standin::Module::Load(modulePath)) {}
+ModuleDetector::ModuleDetector(const std::string& modulePath)
+    : module_(Standin::Module::Load(modulePath)) {}
 
 ModuleDetector::~ModuleDetector() = default;
 
 Refine::ModuleAnswer ModuleDetector::Detect(const Refine::PageImage& page,
                                             const std::optional<Refine::FilterRect>& rect) {
-  if (page.pixelBytes != page.channels) throw std::runtime_error("the module is given gray or RGB pages only");
+  if (page.pixelBytes != page.channels)
+    throw std::runtime_error("the module is given gray or RGB pages only");
   Standin::PageView view;
   view.width = page.width;
   view.height = page.height;

@@ -52,7 +52,8 @@ PageCase FolderCase(const std::string& imagePath) {
 
 std::string WriteCase(const PageCase& c, const std::string& folder) {
   std::filesystem::create_directories(folder);
-  const std::string image = (std::filesystem::path(folder) / (c.name + (c.jpegQuality > 0 ? ".jpg" : ".png"))).string();
+  const std::string image =
+      (std::filesystem::path(folder) / (c.name + (c.jpegQuality > 0 ? ".jpg" : ".png"))).string();
   // A JPEG page is written from before its encoding, so that reading the file
   // back gives the very page that was scored.
   if (c.jpegQuality > 0 && !c.unencoded.pixels.empty()) {

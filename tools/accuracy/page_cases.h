@@ -16,8 +16,8 @@ namespace Accuracy {
 struct PageCase {
   std::string name;
   Truth truth;
-  PageBuffer page;      // as scored
-  int jpegQuality = 0;  // > 0: a JPEG page of this quality
+  PageBuffer page;       // as scored
+  int jpegQuality = 0;   // > 0: a JPEG page of this quality
   PageBuffer unencoded;  // a JPEG page before encoding: what gets written
 };
 

@@ -34,8 +34,9 @@ PageBuffer FromImage(vips::VImage image) {
 
 vips::VImage ToImage(const PageBuffer& page) {
   // new_from_memory does not copy: the copy_memory below detaches the result.
-  auto image = vips::VImage::new_from_memory(const_cast<uint8_t*>(page.pixels.data()), page.pixels.size(),
-                                             page.width, page.height, page.channels, VIPS_FORMAT_UCHAR);
+  auto image =
+      vips::VImage::new_from_memory(const_cast<uint8_t*>(page.pixels.data()), page.pixels.size(),
+                                    page.width, page.height, page.channels, VIPS_FORMAT_UCHAR);
   return image.copy(vips::VImage::option()->set(
       "interpretation", page.channels == 1 ? VIPS_INTERPRETATION_B_W : VIPS_INTERPRETATION_sRGB));
 }
@@ -52,8 +53,8 @@ void StartImageLibrary(const char* program) {
 
 PageBuffer LoadPage(const std::string& path) {
   try {
-    return FromImage(vips::VImage::new_from_file(path.c_str(),
-                                                 vips::VImage::option()->set("access", VIPS_ACCESS_SEQUENTIAL)));
+    return FromImage(vips::VImage::new_from_file(
+        path.c_str(), vips::VImage::option()->set("access", VIPS_ACCESS_SEQUENTIAL)));
   } catch (const vips::VError& e) {
     throw std::runtime_error(path + ": cannot read the image: " + e.what());
   }
@@ -76,7 +77,8 @@ PageBuffer JpegRoundTrip(const PageBuffer& page, int quality) {
   void* buffer = nullptr;
   size_t size = 0;
   try {
-    ToImage(page).write_to_buffer(".jpg", &buffer, &size, vips::VImage::option()->set("Q", quality));
+    ToImage(page).write_to_buffer(".jpg", &buffer, &size,
+                                  vips::VImage::option()->set("Q", quality));
     std::unique_ptr<void, decltype(&std::free)> owned(buffer, &std::free);
     return FromImage(vips::VImage::new_from_buffer(owned.get(), size, ""));
   } catch (const vips::VError& e) {

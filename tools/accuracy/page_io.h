@@ -18,7 +18,8 @@ struct PageBuffer {
   std::vector<uint8_t> pixels;
 
   Refine::PageImage View() const {
-    return {width, height, channels, channels, pixels.data(), static_cast<std::ptrdiff_t>(width) * channels};
+    return {width,    height,        channels,
+            channels, pixels.data(), static_cast<std::ptrdiff_t>(width) * channels};
   }
 };
 

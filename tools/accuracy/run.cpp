@@ -6,7 +6,8 @@ namespace Accuracy {
 Answer RawAnswerOf(const Refine::ModuleAnswer& answer) {
   Answer a;
   a.photo = answer.FoundPhoto();
-  for (size_t k = 0; k < 4; ++k) a.corners[k] = {answer.corners[k].x + 0.5, answer.corners[k].y + 0.5};
+  for (size_t k = 0; k < 4; ++k)
+    a.corners[k] = {answer.corners[k].x + 0.5, answer.corners[k].y + 0.5};
   a.angle = answer.angle;
   return a;
 }
@@ -14,12 +15,14 @@ Answer RawAnswerOf(const Refine::ModuleAnswer& answer) {
 Answer RefinedAnswerOf(const Refine::Refinement& refined) {
   Answer a;
   a.photo = refined.status != Refine::RefineStatus::kNoPhoto;
-  for (size_t k = 0; k < 4; ++k) a.corners[k] = {refined.outline[k].x + 0.5, refined.outline[k].y + 0.5};
+  for (size_t k = 0; k < 4; ++k)
+    a.corners[k] = {refined.outline[k].x + 0.5, refined.outline[k].y + 0.5};
   a.angle = refined.angle;
   return a;
 }
 
-PageOutcome RunCase(Refine::Detector& detector, const PageCase& c, const Refine::PipelineOptions& options) {
+PageOutcome RunCase(Refine::Detector& detector, const PageCase& c,
+                    const Refine::PipelineOptions& options) {
   const Refine::PipelineResult result = Refine::DetectAndRefine(detector, c.page.View(), options);
   PageOutcome o;
   o.name = c.name;

@@ -15,8 +15,8 @@ namespace Accuracy {
 struct PageOutcome {
   std::string name;
   std::string kind;
-  Score raw;      // the module's answer on the page as it is
-  Score refined;  // after preparation and refinement
+  Score raw;           // the module's answer on the page as it is
+  Score refined;       // after preparation and refinement
   std::string status;  // refinement status
   std::vector<std::string> preparations;
   double detectMs = 0.0, prepareMs = 0.0, refineMs = 0.0;
@@ -27,6 +27,7 @@ struct PageOutcome {
 Answer RawAnswerOf(const Refine::ModuleAnswer& answer);
 Answer RefinedAnswerOf(const Refine::Refinement& refined);
 
-PageOutcome RunCase(Refine::Detector& detector, const PageCase& c, const Refine::PipelineOptions& options);
+PageOutcome RunCase(Refine::Detector& detector, const PageCase& c,
+                    const Refine::PipelineOptions& options);
 
 }  // namespace Accuracy

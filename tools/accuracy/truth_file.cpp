@@ -20,7 +20,8 @@ Truth ReadTruthFile(const std::string& path) {
     if (j.contains("angle") && !j["angle"].is_null()) truth.angle = j["angle"].get<double>();
     if (truth.photo) {
       const auto& corners = j.at("corners");
-      if (!corners.is_array() || corners.size() != 4) throw std::runtime_error("\"corners\" must hold four points");
+      if (!corners.is_array() || corners.size() != 4)
+        throw std::runtime_error("\"corners\" must hold four points");
       for (size_t k = 0; k < 4; ++k) {
         const auto& p = corners[k];
         if (!p.is_array() || p.size() != 2) throw std::runtime_error("a corner must be [x, y]");

@@ -21,7 +21,8 @@ double InterpolateLine(const ProfileStrip& strip, int line, double index) {
 }
 
 // Score of a candidate alignment: the energy of the steps of the mean.
-double StepEnergy(const std::vector<std::vector<double>>& groups, const std::vector<double>& shift) {
+double StepEnergy(const std::vector<std::vector<double>>& groups,
+                  const std::vector<double>& shift) {
   const auto width = static_cast<int>(groups.front().size());
   std::vector<double> mean(static_cast<size_t>(width), kNaN);
   const auto needed = static_cast<size_t>(std::max<size_t>(1, (groups.size() * 3 + 3) / 4));
@@ -91,7 +92,8 @@ AlignedProfile AlignProfiles(const ProfileStrip& strip, double maxSlope) {
       }
       if (2 * n >= last - first && n > 0) mean[static_cast<size_t>(k)] = sum / n;
     }
-    groupT[static_cast<size_t>(g)] = 0.5 * (strip.t[static_cast<size_t>(first)] + strip.t[static_cast<size_t>(last - 1)]);
+    groupT[static_cast<size_t>(g)] =
+        0.5 * (strip.t[static_cast<size_t>(first)] + strip.t[static_cast<size_t>(last - 1)]);
   }
 
   // Slope search: structures at s = s0 + b (t - tCentre) appear in group g at
@@ -104,10 +106,12 @@ AlignedProfile AlignProfiles(const ProfileStrip& strip, double maxSlope) {
     for (int i = -kSteps; i <= kSteps; ++i) {
       const double b = maxSlope * i / kSteps;
       for (int g = 0; g < groupCount; ++g)
-        shift[static_cast<size_t>(g)] = b * (groupT[static_cast<size_t>(g)] - out.tCentre) / strip.sStep;
+        shift[static_cast<size_t>(g)] =
+            b * (groupT[static_cast<size_t>(g)] - out.tCentre) / strip.sStep;
       scores.push_back(StepEnergy(groups, shift));
     }
-    const auto best = static_cast<int>(std::max_element(scores.begin(), scores.end()) - scores.begin());
+    const auto best =
+        static_cast<int>(std::max_element(scores.begin(), scores.end()) - scores.begin());
     double refine = 0.0;
     if (best > 0 && best + 1 < static_cast<int>(scores.size())) {
       const double a = scores[static_cast<size_t>(best - 1)];
@@ -124,7 +128,8 @@ AlignedProfile AlignProfiles(const ProfileStrip& strip, double maxSlope) {
   // and specks on a few lines leave the profile alone.
   std::vector<double> shifts(static_cast<size_t>(strip.lines));
   for (int line = 0; line < strip.lines; ++line)
-    shifts[static_cast<size_t>(line)] = bestSlope * (strip.t[static_cast<size_t>(line)] - out.tCentre) / strip.sStep;
+    shifts[static_cast<size_t>(line)] =
+        bestSlope * (strip.t[static_cast<size_t>(line)] - out.tCentre) / strip.sStep;
   std::vector<double> values, steps;
   values.reserve(static_cast<size_t>(strip.lines));
   steps.reserve(static_cast<size_t>(strip.lines));

@@ -14,9 +14,10 @@ struct AlignedProfile {
   double tCentre = 0.0;  // middle of the sampled stretch of the side
   double sFrom = 0.0;
   double sStep = 1.0;
-  std::vector<double> mean;       // median over the lines; NaN where too few reach
-  std::vector<double> roughness;  // median |difference| between neighbouring lines, as a noise sigma
-  double noise = 0.0;             // calmest roughness: the noise of one value, gray levels
+  std::vector<double> mean;  // median over the lines; NaN where too few reach
+  std::vector<double>
+      roughness;       // median |difference| between neighbouring lines, as a noise sigma
+  double noise = 0.0;  // calmest roughness: the noise of one value, gray levels
   int lines = 0;
 
   int Size() const { return static_cast<int>(mean.size()); }

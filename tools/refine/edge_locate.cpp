@@ -5,8 +5,9 @@
 
 namespace Refine {
 
-std::vector<FitSample> LocateEdges(const GraySampler& sampler, const SampleArea& area, const SideFrame& frame,
-                                   const std::vector<double>& t, const LocateRequest& request) {
+std::vector<FitSample> LocateEdges(const GraySampler& sampler, const SampleArea& area,
+                                   const SideFrame& frame, const std::vector<double>& t,
+                                   const LocateRequest& request) {
   constexpr double kStep = 0.5;
   const int reach = static_cast<int>(std::ceil((request.window + 2.0) / kStep));
   const int count = 2 * reach + 1;
@@ -36,7 +37,8 @@ std::vector<FitSample> LocateEdges(const GraySampler& sampler, const SampleArea&
     int best = -1;
     double bestValue = request.minGradient;
     for (int i = 1; i + 1 < count; ++i) {
-      slope[static_cast<size_t>(i)] = request.polarity * (values[static_cast<size_t>(i + 1)] - values[static_cast<size_t>(i - 1)]);
+      slope[static_cast<size_t>(i)] = request.polarity * (values[static_cast<size_t>(i + 1)] -
+                                                          values[static_cast<size_t>(i - 1)]);
       if (std::abs(i - reach) * kStep > request.window) continue;
       if (slope[static_cast<size_t>(i)] > bestValue) {
         bestValue = slope[static_cast<size_t>(i)];

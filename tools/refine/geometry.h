@@ -11,15 +11,30 @@ namespace Refine {
 struct Vec2 {
   double x = 0.0;
   double y = 0.0;
+  bool operator==(const Vec2&) const = default;
 };
 
-inline Vec2 operator+(Vec2 a, Vec2 b) { return {a.x + b.x, a.y + b.y}; }
-inline Vec2 operator-(Vec2 a, Vec2 b) { return {a.x - b.x, a.y - b.y}; }
-inline Vec2 operator*(Vec2 a, double k) { return {a.x * k, a.y * k}; }
-inline double Dot(Vec2 a, Vec2 b) { return a.x * b.x + a.y * b.y; }
-inline double Cross(Vec2 a, Vec2 b) { return a.x * b.y - a.y * b.x; }
-inline double Length(Vec2 a) { return std::hypot(a.x, a.y); }
-inline double Distance(Vec2 a, Vec2 b) { return Length(a - b); }
+inline Vec2 operator+(Vec2 a, Vec2 b) {
+  return {a.x + b.x, a.y + b.y};
+}
+inline Vec2 operator-(Vec2 a, Vec2 b) {
+  return {a.x - b.x, a.y - b.y};
+}
+inline Vec2 operator*(Vec2 a, double k) {
+  return {a.x * k, a.y * k};
+}
+inline double Dot(Vec2 a, Vec2 b) {
+  return a.x * b.x + a.y * b.y;
+}
+inline double Cross(Vec2 a, Vec2 b) {
+  return a.x * b.y - a.y * b.x;
+}
+inline double Length(Vec2 a) {
+  return std::hypot(a.x, a.y);
+}
+inline double Distance(Vec2 a, Vec2 b) {
+  return Length(a - b);
+}
 
 // A line through a point along a unit direction.
 struct Line {

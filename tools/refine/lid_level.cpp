@@ -23,7 +23,9 @@ double Nth(std::vector<double>& v, double p) {
   return v[k];
 }
 
-std::array<double, 6> Terms(double u, double v) { return {1.0, u, v, u * u, u * v, v * v}; }
+std::array<double, 6> Terms(double u, double v) {
+  return {1.0, u, v, u * u, u * v, v * v};
+}
 
 double Evaluate(const std::array<double, 6>& c, double u, double v) {
   const auto t = Terms(u, v);
@@ -33,7 +35,8 @@ double Evaluate(const std::array<double, 6>& c, double u, double v) {
 }
 
 // Weighted least squares of the six terms, by Gaussian elimination.
-bool FitSurface(const std::vector<Block>& blocks, const std::vector<double>& weight, std::array<double, 6>& c) {
+bool FitSurface(const std::vector<Block>& blocks, const std::vector<double>& weight,
+                std::array<double, 6>& c) {
   double a[6][7] = {};
   for (size_t b = 0; b < blocks.size(); ++b) {
     if (weight[b] <= 0.0) continue;
@@ -63,7 +66,8 @@ bool FitSurface(const std::vector<Block>& blocks, const std::vector<double>& wei
 
 LidEstimate EstimateLid(const PageImage& page) {
   LidEstimate out;
-  if (!CheckPageImage(page).empty() || page.width < 2 * kBlock || page.height < 2 * kBlock) return out;
+  if (!CheckPageImage(page).empty() || page.width < 2 * kBlock || page.height < 2 * kBlock)
+    return out;
   const GraySampler g(page);
   const int across = std::clamp(page.width / 100, 4, 24);
   const int down = std::clamp(page.height / 100, 4, 24);
@@ -115,11 +119,16 @@ LidEstimate EstimateLid(const PageImage& page) {
   for (int round = 0; round < 4; ++round) {
     std::vector<double> residual;
     for (size_t i = 0; i < blocks.size(); ++i)
-      if (weight[i] > 0.0) residual.push_back(std::abs(blocks[i].median - Evaluate(out.surface, blocks[i].u, blocks[i].v)));
+      if (weight[i] > 0.0)
+        residual.push_back(
+            std::abs(blocks[i].median - Evaluate(out.surface, blocks[i].u, blocks[i].v)));
     const double scale = std::max(3.0, 1.4826 * Nth(residual, 0.5));
     for (size_t i = 0; i < blocks.size(); ++i) {
       if (blocks[i].noise > 1.5 * out.noise + 1.5) continue;
-      weight[i] = std::abs(blocks[i].median - Evaluate(out.surface, blocks[i].u, blocks[i].v)) <= 3.0 * scale ? 1.0 : 0.0;
+      weight[i] = std::abs(blocks[i].median - Evaluate(out.surface, blocks[i].u, blocks[i].v)) <=
+                          3.0 * scale
+                      ? 1.0
+                      : 0.0;
     }
     if (std::count_if(weight.begin(), weight.end(), [](double w) { return w > 0.0; }) < 8) break;
     std::array<double, 6> fitted{};
@@ -128,7 +137,9 @@ LidEstimate EstimateLid(const PageImage& page) {
   }
   std::vector<double> residual;
   for (size_t i = 0; i < blocks.size(); ++i)
-    if (weight[i] > 0.0) residual.push_back(std::abs(blocks[i].median - Evaluate(out.surface, blocks[i].u, blocks[i].v)));
+    if (weight[i] > 0.0)
+      residual.push_back(
+          std::abs(blocks[i].median - Evaluate(out.surface, blocks[i].u, blocks[i].v)));
   out.residual = residual.empty() ? 0.0 : 1.4826 * Nth(residual, 0.5);
   double lo = 1e9, hi = -1e9;
   for (int i = 0; i <= 8; ++i) {
@@ -146,14 +157,18 @@ double LidAt(const LidEstimate& lid, double u, double v) {
   return Evaluate(lid.surface, std::clamp(u, 0.0, 1.0), std::clamp(v, 0.0, 1.0));
 }
 
-bool NeedsLevelling(double level, double spread) { return level < 150.0 || spread > 60.0; }
+bool NeedsLevelling(double level, double spread) {
+  return level < 150.0 || spread > 60.0;
+}
 
 void LevelLid(std::vector<uint8_t>& pixels, int width, int height, int channels) {
-  const PageImage view{width, height, channels, channels, pixels.data(), static_cast<std::ptrdiff_t>(width) * channels};
+  const PageImage view{width,    height,        channels,
+                       channels, pixels.data(), static_cast<std::ptrdiff_t>(width) * channels};
   const LidEstimate lid = EstimateLid(view);
   if (lid.level <= 0.0) return;
   for (int y = 0; y < height; ++y) {
-    uint8_t* row = pixels.data() + static_cast<size_t>(y) * static_cast<size_t>(width) * static_cast<size_t>(channels);
+    uint8_t* row = pixels.data() + static_cast<size_t>(y) * static_cast<size_t>(width) *
+                                       static_cast<size_t>(channels);
     const double v = (y + 0.5) / height;
     for (int x = 0; x < width; ++x) {
       const double surface = std::max(16.0, Evaluate(lid.surface, (x + 0.5) / width, v));

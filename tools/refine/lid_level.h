@@ -11,9 +11,9 @@
 namespace Refine {
 
 struct LidEstimate {
-  double level = 0.0;   // typical gray of the bare lid
-  double spread = 0.0;  // brightest minus darkest part of the lid's fitted surface
-  double noise = 0.0;   // sensor noise of one gray value
+  double level = 0.0;     // typical gray of the bare lid
+  double spread = 0.0;    // brightest minus darkest part of the lid's fitted surface
+  double noise = 0.0;     // sensor noise of one gray value
   double residual = 0.0;  // typical distance of calm lid blocks from the surface
   // Lid brightness as a surface over the page: c0 + c1 u + c2 v + c3 u^2 + c4 u v + c5 v^2,
   // with u = x / width and v = y / height.

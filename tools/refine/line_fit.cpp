@@ -13,8 +13,8 @@ double Median(std::vector<double>& values) {
   std::nth_element(values.begin(), values.begin() + static_cast<std::ptrdiff_t>(mid), values.end());
   double m = values[mid];
   if (values.size() % 2 == 0) {
-    const double below = *std::max_element(values.begin(),
-                                           values.begin() + static_cast<std::ptrdiff_t>(mid));
+    const double below =
+        *std::max_element(values.begin(), values.begin() + static_cast<std::ptrdiff_t>(mid));
     m = 0.5 * (m + below);
   }
   return m;
@@ -79,8 +79,8 @@ LineFitResult FitLineRobust(std::span<const FitSample> samples, const RobustFitO
     if (!(stt > 0.0)) return result;
     const double newSlope = sts / stt;
     const double newOffset = sm - newSlope * tm;
-    const bool settled =
-        std::abs(newSlope - slope) * (std::abs(tm) + 1.0) < 1e-4 && std::abs(newOffset - offset) < 1e-4;
+    const bool settled = std::abs(newSlope - slope) * (std::abs(tm) + 1.0) < 1e-4 &&
+                         std::abs(newOffset - offset) < 1e-4;
     slope = newSlope;
     offset = newOffset;
     if (settled) break;

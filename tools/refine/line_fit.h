@@ -22,7 +22,7 @@ struct LineFitResult {
 };
 
 struct RobustFitOptions {
-  double minScale = 0.25;      // floor of the residual scale, px
+  double minScale = 0.25;  // floor of the residual scale, px
   double tukeyConstant = 4.685;
   int iterations = 12;
   int minInliers = 6;
@@ -31,6 +31,7 @@ struct RobustFitOptions {
 // Starts from a median-of-slopes estimate (each sample paired with the one
 // half the list away, so the pairs are far apart and the estimate is stable),
 // then re-weights with Tukey's biweight. Samples must be sorted by t.
-LineFitResult FitLineRobust(std::span<const FitSample> samples, const RobustFitOptions& options = {});
+LineFitResult FitLineRobust(std::span<const FitSample> samples,
+                            const RobustFitOptions& options = {});
 
 }  // namespace Refine

@@ -37,10 +37,22 @@ EdgeLine SampleEdgeLine(const GraySampler& g, int edge, int d) {
   for (int i = 0; i < n; ++i) {
     const int a = static_cast<int>((0.03 + 0.94 * (i + 0.5) / n) * along);
     int x = 0, y = 0;
-    if (edge == 0) { x = a; y = d; }
-    if (edge == 1) { x = g.Width() - 1 - d; y = a; }
-    if (edge == 2) { x = a; y = g.Height() - 1 - d; }
-    if (edge == 3) { x = d; y = a; }
+    if (edge == 0) {
+      x = a;
+      y = d;
+    }
+    if (edge == 1) {
+      x = g.Width() - 1 - d;
+      y = a;
+    }
+    if (edge == 2) {
+      x = a;
+      y = g.Height() - 1 - d;
+    }
+    if (edge == 3) {
+      x = d;
+      y = a;
+    }
     line.samples.push_back(g.Pixel(x, y));
   }
   line.median = Percentile(line.samples, 0.5);
@@ -54,7 +66,8 @@ int FindBedStrip(const GraySampler& g, int edge, double lid) {
   if (depth < 16) return 0;
   const double dark = std::min(0.55 * lid, lid - 60.0);
   std::vector<double> median(static_cast<size_t>(depth));
-  for (int d = 0; d < depth; ++d) median[static_cast<size_t>(d)] = SampleEdgeLine(g, edge, d).median;
+  for (int d = 0; d < depth; ++d)
+    median[static_cast<size_t>(d)] = SampleEdgeLine(g, edge, d).median;
   if (median[0] >= dark) return 0;
   const double bed = std::min({median[0], median[1], median[2]});
   const double half = 0.5 * (bed + lid);
@@ -63,7 +76,8 @@ int FindBedStrip(const GraySampler& g, int edge, double lid) {
   if (w < 2 || w + 12 > depth) return 0;
   // The strip runs the whole edge: nearly every sample of its middle line is dark.
   const EdgeLine middle = SampleEdgeLine(g, edge, w / 2);
-  const auto darkCount = std::count_if(middle.samples.begin(), middle.samples.end(), [dark](double v) { return v < dark; });
+  const auto darkCount = std::count_if(middle.samples.begin(), middle.samples.end(),
+                                       [dark](double v) { return v < dark; });
   if (static_cast<double>(darkCount) < 0.8 * static_cast<double>(middle.samples.size())) return 0;
   // And the lid follows it.
   for (int d = w + 3; d < w + 12; ++d)
@@ -79,9 +93,11 @@ void BoxSmooth(std::vector<uint8_t>& pixels, int width, int height, int channels
       for (int c = 0; c < channels; ++c) {
         for (int j = 0; j < length; ++j) line[static_cast<size_t>(j)] = *at(i, j, c);
         int sum = 0;
-        for (int j = -r - 1; j < r; ++j) sum += line[static_cast<size_t>(std::clamp(j, 0, length - 1))];
+        for (int j = -r - 1; j < r; ++j)
+          sum += line[static_cast<size_t>(std::clamp(j, 0, length - 1))];
         for (int j = 0; j < length; ++j) {
-          sum += line[static_cast<size_t>(std::min(j + r, length - 1))] - line[static_cast<size_t>(std::max(j - r - 1, 0))];
+          sum += line[static_cast<size_t>(std::min(j + r, length - 1))] -
+                 line[static_cast<size_t>(std::max(j - r - 1, 0))];
           *at(i, j, c) = static_cast<uint8_t>((sum + box / 2) / box);
         }
       }
@@ -89,10 +105,12 @@ void BoxSmooth(std::vector<uint8_t>& pixels, int width, int height, int channels
   };
   const auto stride = static_cast<size_t>(width) * static_cast<size_t>(channels);
   pass(height, width, [&](int y, int x, int c) {
-    return &pixels[static_cast<size_t>(y) * stride + static_cast<size_t>(x) * static_cast<size_t>(channels) + static_cast<size_t>(c)];
+    return &pixels[static_cast<size_t>(y) * stride +
+                   static_cast<size_t>(x) * static_cast<size_t>(channels) + static_cast<size_t>(c)];
   });
   pass(width, height, [&](int x, int y, int c) {
-    return &pixels[static_cast<size_t>(y) * stride + static_cast<size_t>(x) * static_cast<size_t>(channels) + static_cast<size_t>(c)];
+    return &pixels[static_cast<size_t>(y) * stride +
+                   static_cast<size_t>(x) * static_cast<size_t>(channels) + static_cast<size_t>(c)];
   });
 }
 
@@ -101,7 +119,8 @@ std::string Describe(const char* kind, double a, double b) {
   if (kind[0] == 's') {
     std::snprintf(text, sizeof text, "noise of %.1f gray levels smoothed with a %.0f px box", a, b);
   } else if (kind[0] == 'l') {
-    std::snprintf(text, sizeof text, "lid levelled to white (was %.0f gray, drifting by %.0f)", a, b);
+    std::snprintf(text, sizeof text, "lid levelled to white (was %.0f gray, drifting by %.0f)", a,
+                  b);
   } else {
     std::snprintf(text, sizeof text, "%.0f px left out of the filter rectangle", a);
   }
@@ -119,7 +138,8 @@ PageSurvey SurveyPage(const PageImage& page) {
   survey.lidSpread = lid.spread;
   survey.noise = lid.noise;
   survey.lid = lid;
-  for (int edge = 0; edge < 4; ++edge) survey.bedStrip[static_cast<size_t>(edge)] = FindBedStrip(g, edge, lid.level);
+  for (int edge = 0; edge < 4; ++edge)
+    survey.bedStrip[static_cast<size_t>(edge)] = FindBedStrip(g, edge, lid.level);
   return survey;
 }
 
@@ -131,12 +151,15 @@ PreparedPage PreparePage(const PageImage& page, const PrepareOptions& options) {
   if (s.lidLevel <= 0.0) return out;
 
   if (options.bedStrips) {
-    FilterRect rect{s.bedStrip[0], s.bedStrip[3], page.height - s.bedStrip[2], page.width - s.bedStrip[1]};
-    if (rect != FilterRect{0, 0, page.height, page.width} && rect[2] - rect[0] >= 64 && rect[3] - rect[1] >= 64) {
+    FilterRect rect{s.bedStrip[0], s.bedStrip[3], page.height - s.bedStrip[2],
+                    page.width - s.bedStrip[1]};
+    if (rect != FilterRect{0, 0, page.height, page.width} && rect[2] - rect[0] >= 64 &&
+        rect[3] - rect[1] >= 64) {
       out.filterRect = rect;
       for (size_t edge = 0; edge < 4; ++edge) {
         if (s.bedStrip[edge] == 0) continue;
-        out.steps.push_back({"bed-strip", std::string("dark strip of the scanner bed along the ") + kEdgeNames[edge] +
+        out.steps.push_back({"bed-strip", std::string("dark strip of the scanner bed along the ") +
+                                              kEdgeNames[edge] +
                                               " edge: " + Describe("bed", s.bedStrip[edge], 0.0)});
       }
     }
@@ -150,15 +173,19 @@ PreparedPage PreparePage(const PageImage& page, const PrepareOptions& options) {
   if (!smooth && !level) return out;
 
   // A tight copy of the page for the module.
-  out.pixels.resize(static_cast<size_t>(page.width) * static_cast<size_t>(page.height) * static_cast<size_t>(page.channels));
+  out.pixels.resize(static_cast<size_t>(page.width) * static_cast<size_t>(page.height) *
+                    static_cast<size_t>(page.channels));
   for (int y = 0; y < page.height; ++y) {
     const uint8_t* src = page.pixels + static_cast<std::ptrdiff_t>(y) * page.rowBytes;
-    uint8_t* dst = out.pixels.data() + static_cast<size_t>(y) * static_cast<size_t>(page.width) * static_cast<size_t>(page.channels);
+    uint8_t* dst = out.pixels.data() + static_cast<size_t>(y) * static_cast<size_t>(page.width) *
+                                           static_cast<size_t>(page.channels);
     for (int x = 0; x < page.width; ++x)
-      for (int c = 0; c < page.channels; ++c) dst[x * page.channels + c] = src[x * page.pixelBytes + c];
+      for (int c = 0; c < page.channels; ++c)
+        dst[x * page.channels + c] = src[x * page.pixelBytes + c];
   }
-  out.view = PageImage{page.width, page.height, page.channels, page.channels, out.pixels.data(),
-                       static_cast<std::ptrdiff_t>(page.width) * page.channels};
+  out.view = PageImage{page.width,        page.height,
+                       page.channels,     page.channels,
+                       out.pixels.data(), static_cast<std::ptrdiff_t>(page.width) * page.channels};
   if (level) {
     LevelLid(out.pixels, page.width, page.height, page.channels);
     out.steps.push_back({"level-lid", Describe("level", s.lidLevel, s.lidSpread)});

@@ -40,10 +40,10 @@ struct PageSurvey {
 PageSurvey SurveyPage(const PageImage& page);
 
 struct PreparedPage {
-  std::vector<Preparation> steps;      // empty: the module sees the page as it is
+  std::vector<Preparation> steps;  // empty: the module sees the page as it is
   std::optional<FilterRect> filterRect;
-  std::vector<uint8_t> pixels;         // the prepared copy, when one was needed
-  PageImage view;                      // what the module should see: the page or the copy
+  std::vector<uint8_t> pixels;  // the prepared copy, when one was needed
+  PageImage view;               // what the module should see: the page or the copy
   PageSurvey survey;
 };
 

@@ -13,17 +13,22 @@ double Since(std::chrono::steady_clock::time_point start) {
 // How good a refinement is, for choosing between two.
 int Rank(const Refinement& r) {
   switch (r.status) {
-    case RefineStatus::kRefined: return 3;
-    case RefineStatus::kPartial: return 2;
-    case RefineStatus::kKept: return 1;
-    case RefineStatus::kNoPhoto: return 0;
+    case RefineStatus::kRefined:
+      return 3;
+    case RefineStatus::kPartial:
+      return 2;
+    case RefineStatus::kKept:
+      return 1;
+    case RefineStatus::kNoPhoto:
+      return 0;
   }
   return 0;
 }
 
 }  // namespace
 
-PipelineResult DetectAndRefine(Detector& detector, const PageImage& page, const PipelineOptions& options) {
+PipelineResult DetectAndRefine(Detector& detector, const PageImage& page,
+                               const PipelineOptions& options) {
   PipelineResult result;
   auto start = std::chrono::steady_clock::now();
   result.raw = detector.Detect(page, std::nullopt);
@@ -35,7 +40,8 @@ PipelineResult DetectAndRefine(Detector& detector, const PageImage& page, const 
     start = std::chrono::steady_clock::now();
     const PreparedPage prepared = PreparePage(page, options.preparation);
     result.prepareSeconds = Since(start);
-    if (!refineOptions.lid && prepared.survey.lidLevel > 0.0) refineOptions.lid = prepared.survey.lid;
+    if (!refineOptions.lid && prepared.survey.lidLevel > 0.0)
+      refineOptions.lid = prepared.survey.lid;
     if (!prepared.steps.empty()) {
       result.preparations = prepared.steps;
       result.filterRect = prepared.filterRect;
@@ -45,8 +51,9 @@ PipelineResult DetectAndRefine(Detector& detector, const PageImage& page, const 
       if (result.prepared->FoundPhoto() || !result.raw.FoundPhoto()) chosen = *result.prepared;
       if (prepared.filterRect && !refineOptions.area) {
         const FilterRect& r = *prepared.filterRect;
-        refineOptions.area = SampleArea{static_cast<double>(r[1]), static_cast<double>(r[0]),
-                                        static_cast<double>(r[3] - 1), static_cast<double>(r[2] - 1)};
+        refineOptions.area =
+            SampleArea{static_cast<double>(r[1]), static_cast<double>(r[0]),
+                       static_cast<double>(r[3] - 1), static_cast<double>(r[2] - 1)};
       }
     }
   }

@@ -20,16 +20,17 @@ struct PipelineOptions {
 };
 
 struct PipelineResult {
-  ModuleAnswer raw;                        // the module's answer on the page as it is
-  std::vector<Preparation> preparations;   // what was done before the second run
-  std::optional<FilterRect> filterRect;    // the second run's filter rectangle
-  std::optional<ModuleAnswer> prepared;    // the module's answer on the prepared page
-  Refinement refined;                      // the final outline
-  double detectSeconds = 0.0;              // both module runs
+  ModuleAnswer raw;                       // the module's answer on the page as it is
+  std::vector<Preparation> preparations;  // what was done before the second run
+  std::optional<FilterRect> filterRect;   // the second run's filter rectangle
+  std::optional<ModuleAnswer> prepared;   // the module's answer on the prepared page
+  Refinement refined;                     // the final outline
+  double detectSeconds = 0.0;             // both module runs
   double prepareSeconds = 0.0;
   double refineSeconds = 0.0;
 };
 
-PipelineResult DetectAndRefine(Detector& detector, const PageImage& page, const PipelineOptions& options = {});
+PipelineResult DetectAndRefine(Detector& detector, const PageImage& page,
+                               const PipelineOptions& options = {});
 
 }  // namespace Refine

@@ -6,7 +6,8 @@
 namespace Refine {
 
 ProfileStrip SampleStrip(const GraySampler& sampler, const SampleArea& area, const SideFrame& frame,
-                         std::span<const double> t, double sFrom, double sStep, int width, int smear) {
+                         std::span<const double> t, double sFrom, double sStep, int width,
+                         int smear) {
   ProfileStrip strip;
   strip.lines = static_cast<int>(t.size());
   strip.width = width;

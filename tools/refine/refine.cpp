@@ -112,7 +112,8 @@ void PlaceSide(const GraySampler& sampler, const SampleArea& area, SideWork& wor
   const double midT = 0.5 * length;
   if (fit.ok) {
     const double support = static_cast<double>(fit.inliers) / fineLines;
-    const double apart = std::abs((fit.offset + fit.slope * midT) - (coarseOffset + reading.slope * midT));
+    const double apart =
+        std::abs((fit.offset + fit.slope * midT) - (coarseOffset + reading.slope * midT));
     if (support >= 0.3 && fit.rms <= 1.5 && apart <= 3.0 && std::abs(fit.slope) < 0.035) {
       result.status = SideStatus::kRefined;
       result.line = LineInFrame(frame, fit.offset, fit.slope);
@@ -141,7 +142,8 @@ void PlaceSide(const GraySampler& sampler, const SampleArea& area, SideWork& wor
     innerRequest.minGradient = std::max(2.0, 3.0 * lineNoise);
     const auto innerSamples = LocateEdges(sampler, area, frame, tFine, innerRequest);
     const LineFitResult innerFit = FitLineRobust(innerSamples);
-    if (innerFit.ok && static_cast<double>(innerFit.inliers) / fineLines >= 0.3 && innerFit.rms <= 1.5)
+    if (innerFit.ok && static_cast<double>(innerFit.inliers) / fineLines >= 0.3 &&
+        innerFit.rms <= 1.5)
       work.inner = LineInFrame(frame, innerFit.offset, innerFit.slope);
   }
 }
@@ -164,7 +166,9 @@ double AngleOfSides(const Quad& quad, const std::array<SideResult, 4>& sides, do
   double weighted = 0.0, total = 0.0, reference = 0.0;
   for (int k = 0; k < 4; ++k) {
     const SideStatus status = sides[k].status;
-    if (status != SideStatus::kRefined && status != SideStatus::kCoarse && status != SideStatus::kInferred) continue;
+    if (status != SideStatus::kRefined && status != SideStatus::kCoarse &&
+        status != SideStatus::kInferred)
+      continue;
     const Vec2 d = masked[(k + 1) % 4] - masked[k];
     const double len = Length(d);
     double a = FoldedDirectionDegrees(d);
@@ -184,29 +188,40 @@ double AngleOfSides(const Quad& quad, const std::array<SideResult, 4>& sides, do
 
 std::string_view StatusName(RefineStatus status) {
   switch (status) {
-    case RefineStatus::kRefined: return "refined";
-    case RefineStatus::kPartial: return "partial";
-    case RefineStatus::kKept: return "kept";
-    case RefineStatus::kNoPhoto: return "no-photo";
+    case RefineStatus::kRefined:
+      return "refined";
+    case RefineStatus::kPartial:
+      return "partial";
+    case RefineStatus::kKept:
+      return "kept";
+    case RefineStatus::kNoPhoto:
+      return "no-photo";
   }
   return "unknown";
 }
 
 std::string_view StatusName(SideStatus status) {
   switch (status) {
-    case SideStatus::kRefined: return "refined";
-    case SideStatus::kCoarse: return "coarse";
-    case SideStatus::kPageEdge: return "page-edge";
-    case SideStatus::kInferred: return "inferred";
-    case SideStatus::kKept: return "kept";
+    case SideStatus::kRefined:
+      return "refined";
+    case SideStatus::kCoarse:
+      return "coarse";
+    case SideStatus::kPageEdge:
+      return "page-edge";
+    case SideStatus::kInferred:
+      return "inferred";
+    case SideStatus::kKept:
+      return "kept";
   }
   return "unknown";
 }
 
-ModuleAnswer ModuleAnswer::FromPoints(const std::array<int32_t, 8>& points, double angle, int confidence) {
+ModuleAnswer ModuleAnswer::FromPoints(const std::array<int32_t, 8>& points, double angle,
+                                      int confidence) {
   ModuleAnswer answer;
   for (size_t k = 0; k < 4; ++k)
-    answer.corners[k] = {static_cast<double>(points[2 * k + 1]), static_cast<double>(points[2 * k])};
+    answer.corners[k] = {static_cast<double>(points[2 * k + 1]),
+                         static_cast<double>(points[2 * k])};
   answer.angle = angle;
   answer.confidence = confidence;
   return answer;
@@ -220,12 +235,14 @@ Refinement Unrefined(const ModuleAnswer& answer, std::string reason) {
   out.picture = answer.corners;
   out.angle = answer.angle;
   for (int k = 0; k < 4; ++k) {
-    if (auto line = LineThrough(answer.corners[k], answer.corners[(k + 1) % 4])) out.sides[k].line = *line;
+    if (auto line = LineThrough(answer.corners[k], answer.corners[(k + 1) % 4]))
+      out.sides[k].line = *line;
   }
   return out;
 }
 
-Refinement RefineOutline(const PageImage& page, const ModuleAnswer& answer, const RefineOptions& options) {
+Refinement RefineOutline(const PageImage& page, const ModuleAnswer& answer,
+                         const RefineOptions& options) {
   Refinement out = Unrefined(answer, "");
   if (const std::string problem = CheckPageImage(page); !problem.empty()) {
     out.status = RefineStatus::kKept;
@@ -243,8 +260,8 @@ Refinement RefineOutline(const PageImage& page, const ModuleAnswer& answer, cons
     return out;
   }
 
-  const SampleArea area = options.area.value_or(
-      SampleArea{0.0, 0.0, static_cast<double>(page.width - 1), static_cast<double>(page.height - 1)});
+  const SampleArea area = options.area.value_or(SampleArea{
+      0.0, 0.0, static_cast<double>(page.width - 1), static_cast<double>(page.height - 1)});
   const GraySampler sampler(page);
   const double across = std::min(Distance(answer.corners[0], answer.corners[1]),
                                  Distance(answer.corners[1], answer.corners[2]));
@@ -292,7 +309,8 @@ Refinement RefineOutline(const PageImage& page, const ModuleAnswer& answer, cons
       // for the paper's): look again in a band three times as wide.
       // Outward, as far as the page's edge if the paper may run on to it.
       const double in = std::min(3.0 * reach, 0.45 * across);
-      const double outward = std::min(std::max(3.0 * reach, DistanceToArea(area, w.frame) + 2.0), across);
+      const double outward =
+          std::min(std::max(3.0 * reach, DistanceToArea(area, w.frame) + 2.0), across);
       AlignedProfile wide = MeasureSide(sampler, area, w, -in, outward);
       SideReading again = ReadSide(wide, readOptions);
       if (again.found) {
@@ -314,7 +332,8 @@ Refinement RefineOutline(const PageImage& page, const ModuleAnswer& answer, cons
   }
   // Two sides whose widths agree, or three or more.
   bool margin = widths.size() >= 3;
-  if (widths.size() == 2) margin = std::abs(widths[0] - widths[1]) <= std::max(4.0, 0.2 * std::max(widths[0], widths[1]));
+  if (widths.size() == 2)
+    margin = std::abs(widths[0] - widths[1]) <= std::max(4.0, 0.2 * std::max(widths[0], widths[1]));
   std::array<Line, 4> innerLines{};
   if (margin) {
     std::sort(widths.begin(), widths.end());
@@ -344,7 +363,9 @@ Refinement RefineOutline(const PageImage& page, const ModuleAnswer& answer, cons
     out.sides[k] = work[k].result;
     const SideStatus status = work[k].result.status;
     if (status != SideStatus::kKept) ++refined;
-    if (status == SideStatus::kRefined || status == SideStatus::kCoarse || status == SideStatus::kInferred) ++edges;
+    if (status == SideStatus::kRefined || status == SideStatus::kCoarse ||
+        status == SideStatus::kInferred)
+      ++edges;
   }
   if (edges == 0) {
     // Not one side of the module's outline lies on a step in the page: what

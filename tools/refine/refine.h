@@ -29,7 +29,8 @@ struct ModuleAnswer {
   int confidence = 0;
 
   // From the descriptor's values pt1v, pt1h, ..., pt4v, pt4h.
-  static ModuleAnswer FromPoints(const std::array<int32_t, 8>& points, double angle, int confidence);
+  static ModuleAnswer FromPoints(const std::array<int32_t, 8>& points, double angle,
+                                 int confidence);
   bool FoundPhoto() const { return confidence == 255; }
 };
 
@@ -54,8 +55,8 @@ std::string_view StatusName(SideStatus status);
 struct SideResult {
   SideStatus status = SideStatus::kKept;
   Line line{};
-  double rms = 0.0;      // spread of the edge positions about the line, px
-  double support = 0.0;  // share of the positions along the side that agree with it
+  double rms = 0.0;       // spread of the edge positions about the line, px
+  double support = 0.0;   // share of the positions along the side that agree with it
   double contrast = 0.0;  // step across the edge, gray levels
   double shift = 0.0;     // how far the side moved outward from the module's, px (mid-side)
   bool band = false;      // a lid shadow band lies outside it
@@ -66,11 +67,11 @@ struct SideResult {
 struct Refinement {
   RefineStatus status = RefineStatus::kKept;
   std::string reason;
-  Quad outline{};        // the paper's outer edge
-  double angle = 0.0;    // degrees, the module's sign convention
+  Quad outline{};                     // the paper's outer edge
+  double angle = 0.0;                 // degrees, the module's sign convention
   std::array<SideResult, 4> sides{};  // top, right, bottom, left
-  bool margin = false;   // a white paper margin was found
-  Quad picture{};        // the picture inside the margin (the outline without one)
+  bool margin = false;                // a white paper margin was found
+  Quad picture{};                     // the picture inside the margin (the outline without one)
 };
 
 struct RefineOptions {
@@ -84,7 +85,8 @@ struct RefineOptions {
   std::function<void(int side, const struct AlignedProfile&, const struct SideReading&)> inspect;
 };
 
-Refinement RefineOutline(const PageImage& page, const ModuleAnswer& answer, const RefineOptions& options = {});
+Refinement RefineOutline(const PageImage& page, const ModuleAnswer& answer,
+                         const RefineOptions& options = {});
 
 // The module's answer passed on as it is (kKept, or kNoPhoto when it found none).
 Refinement Unrefined(const ModuleAnswer& answer, std::string reason);

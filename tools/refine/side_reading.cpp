@@ -72,11 +72,13 @@ class Reader {
     // Gradient (per index) with a light [1 2 1] smoothing.
     std::vector<double> raw(static_cast<size_t>(n), kNaN);
     for (int k = 1; k + 1 < n; ++k)
-      raw[static_cast<size_t>(k)] = 0.5 * (profile.mean[static_cast<size_t>(k + 1)] - profile.mean[static_cast<size_t>(k - 1)]);
+      raw[static_cast<size_t>(k)] = 0.5 * (profile.mean[static_cast<size_t>(k + 1)] -
+                                           profile.mean[static_cast<size_t>(k - 1)]);
     grad_.assign(static_cast<size_t>(n), kNaN);
     for (int k = 1; k + 1 < n; ++k)
-      grad_[static_cast<size_t>(k)] =
-          0.25 * raw[static_cast<size_t>(k - 1)] + 0.5 * raw[static_cast<size_t>(k)] + 0.25 * raw[static_cast<size_t>(k + 1)];
+      grad_[static_cast<size_t>(k)] = 0.25 * raw[static_cast<size_t>(k - 1)] +
+                                      0.5 * raw[static_cast<size_t>(k)] +
+                                      0.25 * raw[static_cast<size_t>(k + 1)];
     rough_.assign(static_cast<size_t>(n), kNaN);
     for (int k = 1; k + 1 < n; ++k) {
       double s = 0.0;
@@ -119,12 +121,14 @@ class Reader {
       // A step between two levels; dust and lid texture wiggle about one.
       const double inside = mean_.Mean(c.k - 7.0, c.k - 2.0);
       const double outside = mean_.Mean(c.k + 2.0, c.k + 7.0);
-      if (std::isnan(inside) || std::isnan(outside) || std::abs(inside - outside) < stepThreshold_) continue;
+      if (std::isnan(inside) || std::isnan(outside) || std::abs(inside - outside) < stepThreshold_)
+        continue;
       // Beyond the paper the lid comes back within a shadow's length; a pale
       // stretch of picture does not reach the lid's level.
       if (options_.expectedLid > 0.0) {
         const double brightest = mean_.Max(c.k + 2.0, c.k + 40.0);
-        if (std::isnan(brightest) || brightest < options_.expectedLid - options_.lidTolerance) continue;
+        if (std::isnan(brightest) || brightest < options_.expectedLid - options_.lidTolerance)
+          continue;
       }
       outer = &c;
       break;
@@ -188,7 +192,8 @@ class Reader {
       lid_ = kNaN;
       return;
     }
-    std::nth_element(levels.begin(), levels.begin() + static_cast<std::ptrdiff_t>(levels.size() / 2), levels.end());
+    std::nth_element(levels.begin(),
+                     levels.begin() + static_cast<std::ptrdiff_t>(levels.size() / 2), levels.end());
     lid_ = levels[levels.size() / 2];
   }
 
@@ -214,7 +219,8 @@ class Reader {
       candidates_.push_back({k + shift, b, g > 0.0 ? 1 : -1});
     }
     // Outermost first.
-    std::sort(candidates_.begin(), candidates_.end(), [](const Candidate& x, const Candidate& y) { return x.k > y.k; });
+    std::sort(candidates_.begin(), candidates_.end(),
+              [](const Candidate& x, const Candidate& y) { return x.k > y.k; });
   }
 
   // Median gradient over an index range (0 outside the profile): its size
@@ -238,7 +244,8 @@ class Reader {
       if (!Smooth(k + 1.0, k + 6.0) || Smooth(k - 6.0, k - 1.0)) continue;
       if (options_.expectedLid > 0.0) {
         const double brightest = mean_.Max(k + 1.0, k + 40.0);
-        if (std::isnan(brightest) || brightest < options_.expectedLid - options_.lidTolerance) continue;
+        if (std::isnan(brightest) || brightest < options_.expectedLid - options_.lidTolerance)
+          continue;
       }
       int best = k;
       for (int j = k - 3; j <= k + 3; ++j) {
@@ -268,8 +275,9 @@ class Reader {
     const double bandRough = roughSeries_.Median(innerK + 1.0, outerK - 1.0);
     const double insideRough = roughSeries_.Median(innerK - 8.0, innerK - 2.0);
     if (std::isnan(bandRough)) return false;
-    const bool calm = bandRough <= CalmLimit() ||
-                      (bandRough <= 1.6 * CalmLimit() && !std::isnan(insideRough) && bandRough <= 0.6 * insideRough);
+    const bool calm =
+        bandRough <= CalmLimit() || (bandRough <= 1.6 * CalmLimit() && !std::isnan(insideRough) &&
+                                     bandRough <= 0.6 * insideRough);
     if (!calm) return false;
     const double level = mean_.Mean(innerK + 1.0, outerK - 1.0);
     if (std::isnan(level) || level > lid_ - std::max(10.0, 0.08 * lid_)) return false;
@@ -316,7 +324,8 @@ class Reader {
     const bool calm = Smooth(last - 10.0, last);
     const double lid = options_.expectedLid > 0.0 ? options_.expectedLid : lid_;
     const double tolerance = options_.expectedLid > 0.0 ? options_.lidTolerance : stepThreshold_;
-    if (std::isnan(level) || (calm && (std::isnan(lid) || std::abs(level - lid) < tolerance))) return r;
+    if (std::isnan(level) || (calm && (std::isnan(lid) || std::abs(level - lid) < tolerance)))
+      return r;
     r.pageEdge = true;
     r.found = true;
     r.offset = p_.OffsetOf(last);

@@ -24,10 +24,10 @@ struct SideReading {
   bool margin = false;  // a white paper margin lies inside the edge
   double innerOffset = 0.0;
   int innerPolarity = 0;
-  double lid = 0.0;    // lid level outside the edge
+  double lid = 0.0;          // lid level outside the edge
   double expectedLid = 0.0;  // the lid's level expected there from the whole page
-  double noise = 0.0;  // noise of one profile value
-  std::string note;    // what decided the reading
+  double noise = 0.0;        // noise of one profile value
+  std::string note;          // what decided the reading
 };
 
 struct ReadOptions {
