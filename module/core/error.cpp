@@ -6,6 +6,9 @@ namespace Vireo {
 CError::CError(const CText& task, const CText& reason, bool silent, bool alert)
     : task_(task), reason_(reason), silent_(silent), alert_(alert) {}
 
+CError::CError(const char* task, const char* reason, bool silent, bool alert)
+    : CError(CText(task), CText(reason), silent, alert) {}
+
 CError::CError(bool silent, bool alert) : silent_(silent), alert_(alert) {}
 
 CError::CError(const CException& other) : silent_(other.IsSilent()), alert_(other.ShowsAlert()) {

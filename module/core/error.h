@@ -11,6 +11,8 @@ namespace Vireo {
 class CError : public CException {
  public:
   CError(const CText& task, const CText& reason, bool silent = false, bool alert = true);
+  // From 8-bit strings; without it two literals would reach the flags below.
+  CError(const char* task, const char* reason, bool silent = false, bool alert = true);
   CError(bool silent, bool alert);
   // Takes over the texts and flags of another exception.
   explicit CError(const CException& other);

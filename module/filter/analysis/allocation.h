@@ -1,5 +1,6 @@
-// Zero-filled working arrays for the analysis, with a switch that lets tests
-// make the next allocations fail so that every failure path can be reached.
+// Zero-filled working arrays for the analysis, with switches that let tests
+// make allocations fail so that every failure path and every slower road can
+// be reached.
 #pragma once
 
 #include <cstddef>
@@ -21,6 +22,20 @@ bool AnalysisAllocationRefused();
 template <typename T>
 std::unique_ptr<T[]> AllocateZeroed(std::size_t count) {
   if (count == 0 || AnalysisAllocationRefused()) return nullptr;
+  return std::unique_ptr<T[]>(new (std::nothrow) T[count]());
+}
+
+// Workspaces only make a stage faster: a stage that cannot have one takes a
+// slower road to the same result. They are kept apart from the allocations
+// above, whose failures the stages report, and tests refuse them separately.
+void RefuseWorkspaces(bool refuse);
+bool WorkspacesRefused();
+
+// A zero-filled workspace of count elements, or null (count 0, no memory,
+// or refused by a test).
+template <typename T>
+std::unique_ptr<T[]> AllocateWorkspace(std::size_t count) {
+  if (count == 0 || WorkspacesRefused()) return nullptr;
   return std::unique_ptr<T[]>(new (std::nothrow) T[count]());
 }
 

@@ -1,4 +1,5 @@
 // StraightenPoints, FitBox with its window sums, GrowQuad and RotatePoint.
+// The occupancy arrays hold whole numbers only, so their window sums slide.
 #include "filter/analysis/box_fit.h"
 
 #include <algorithm>
@@ -40,33 +41,33 @@ struct Sides {
   double high = 0.0;
 };
 
+// WindowSum for arrays of whole numbers: each window's sum follows from the
+// one before by one entry in and one out, exact because every partial sum
+// is a whole number far below 2^53.
+void WholeWindowSum(double* values, double* scratch, int32_t length, int32_t window) {
+  const int32_t half = window / 2;
+  const int32_t tail = window - half - 1;
+  const int32_t begin = std::max(half, 0);
+  const int32_t end = std::min(length - tail, length);
+  if (begin >= end) return;
+  if (window <= 0) {
+    std::fill(values + begin, values + end, 0.0);
+    return;
+  }
+  std::copy_n(values, length, scratch);
+  double sum = 0.0;
+  for (int32_t j = begin - half; j <= begin + tail; ++j) sum += scratch[j];
+  values[begin] = sum;
+  for (int32_t i = begin + 1; i < end; ++i) {
+    sum += scratch[i + tail] - scratch[i - half - 1];
+    values[i] = sum;
+  }
+}
+
 double LargestEntry(const double* values, int32_t length) {
   double largest = values[0];
   for (int32_t k = 1; k < length; ++k) largest = std::max(largest, values[k]);
   return largest;
-}
-
-// The occupancy edges: the first and last cell within 1.0 of half the
-// largest smoothed value, with the fallbacks cell 0 and the last cell.
-Sides OccupancyEdges(const double* occupancy, int32_t cells, double origin) {
-  const double half = LargestEntry(occupancy, cells) * 0.5;
-  const auto near = [&](int32_t k) { return std::abs(occupancy[k] - half) <= 1.0; };
-  int32_t first = 0;
-  for (int32_t k = 0; k < cells; ++k) {
-    if (near(k)) {
-      first = k;
-      break;
-    }
-  }
-  int32_t last = -1;
-  for (int32_t k = cells - 1; k >= 0; --k) {
-    if (near(k)) {
-      last = k;
-      break;
-    }
-  }
-  if (last < 1) last = cells - 1;
-  return {static_cast<double>(first) + origin, static_cast<double>(last) + origin};
 }
 
 // Finds the two sides of one axis from the coordinates of the points.
@@ -94,12 +95,13 @@ bool FitAxis(const DoubleList& list, int32_t n, const AnalysisParams& params, Si
   // The smoothing window: half the peak of the occupancy summed over the
   // margin, at most the margin itself.
   std::copy_n(axis.occupancy.get(), axis.cells, axis.copy.get());
-  WindowSum(axis.copy.get(), axis.scratch.get(), axis.cells, margin);
+  WholeWindowSum(axis.copy.get(), axis.scratch.get(), axis.cells, margin);
   auto window = static_cast<int16_t>(
       static_cast<int16_t>(TruncToInt32(LargestEntry(axis.copy.get(), axis.cells))) / 2);
   if (window > margin) window = margin;
-  WindowSum(axis.occupancy.get(), axis.scratch.get(), axis.cells, window);
-  const Sides occupied = OccupancyEdges(axis.occupancy.get(), axis.cells, origin);
+  WholeWindowSum(axis.occupancy.get(), axis.scratch.get(), axis.cells, window);
+  Sides occupied;
+  OccupancyEdges(axis.occupancy.get(), axis.cells, origin, occupied.low, occupied.high);
 
   // The count edges: cells holding at least minCount points.
   int32_t first = -1;
@@ -158,6 +160,29 @@ void WindowSum(double* values, double* scratch, int32_t length, int32_t window) 
     for (int32_t j = i - half; j <= i + tail; ++j) sum += scratch[j];
     values[i] = sum;
   }
+}
+
+void OccupancyEdges(const double* occupancy, int32_t cells, double origin, double& nearEdge,
+                    double& farEdge) {
+  const double half = LargestEntry(occupancy, cells) * 0.5;
+  const auto crosses = [&](int32_t k) { return std::abs(occupancy[k] - half) <= 1.0; };
+  int32_t first = 0;
+  for (int32_t k = 0; k < cells; ++k) {
+    if (crosses(k)) {
+      first = k;
+      break;
+    }
+  }
+  int32_t last = -1;
+  for (int32_t k = cells - 1; k >= 0; --k) {
+    if (crosses(k)) {
+      last = k;
+      break;
+    }
+  }
+  if (last < 1) last = cells - 1;
+  nearEdge = static_cast<double>(first) + origin;
+  farEdge = static_cast<double>(last) + origin;
 }
 
 bool FitBox(const DoubleList& xs, const DoubleList& ys, BoxCorners& corners,

@@ -24,6 +24,12 @@ void StraightenPoints(DoubleList& xs, DoubleList& ys, double angleDegrees, const
 // clears the array. scratch holds length entries for the old values.
 void WindowSum(double* values, double* scratch, int32_t length, int32_t window);
 
+// The occupancy edges of one axis: origin + the first and origin + the last
+// cell whose smoothed occupancy lies within 1.0 of half the largest; cell 0
+// when there is no first, the last cell when there is no last or it is 0.
+void OccupancyEdges(const double* occupancy, int32_t cells, double origin, double& nearEdge,
+                    double& farEdge);
+
 // Writes the box corners and answers true; false for no points, an empty cell
 // range or a working array that cannot be had.
 bool FitBox(const DoubleList& xs, const DoubleList& ys, BoxCorners& corners,

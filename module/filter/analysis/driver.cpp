@@ -30,25 +30,20 @@ constexpr int16_t kNoConfidence = 0;
 constexpr int16_t kWholePageConfidence = 127;
 constexpr int16_t kFoundConfidence = 255;
 
-AnalysisParams MakeParams(int16_t width, int16_t height) {
-  AnalysisParams params;
-  params.minCount = TruncToInt32(static_cast<double>(std::min(width, height)) * 0.15);
-  return params;
-}
-
 // The second half: outline points, angle, upright box, corners turned back
 // and rounded into the result. False when a stage fails.
-bool FindPhotoCorners(const FrameView& frame, AnalysisHost& host, Rect search, const Rect& image,
-                      const PointD& centre, const AnalysisParams& params, ProgressCounter& progress,
+bool FindPhotoCorners(const StageSet& stages, const FrameView& frame, AnalysisHost& host,
+                      Rect search, const Rect& image, const PointD& centre,
+                      const AnalysisParams& params, ProgressCounter& progress,
                       AnalysisResult& result) {
   DoubleList xs;
   DoubleList ys;
   ClipRect(search, image);
-  if (!FindEdgePoints(frame, host, search, xs, ys, progress)) return false;
-  if (!EstimateAngle(xs, ys, kAngleBins, result.angle)) return false;
+  if (!stages.findEdgePoints(frame, host, search, xs, ys, progress)) return false;
+  if (!stages.estimateAngle(xs, ys, kAngleBins, result.angle)) return false;
   StraightenPoints(xs, ys, result.angle, centre);
   BoxCorners box;
-  if (!FitBox(xs, ys, box, params)) return false;
+  if (!stages.fitBox(xs, ys, box, params)) return false;
   GrowQuad(box, -1.0, -1.0);
   for (PointD& corner : box) RotatePoint(corner, result.angle * kRadiansPerDegree, centre);
   RoundCorners(box, result.corners);
@@ -58,10 +53,27 @@ bool FindPhotoCorners(const FrameView& frame, AnalysisHost& host, Rect search, c
 
 }  // namespace
 
+AnalysisParams MakeAnalysisParams(int16_t width, int16_t height) {
+  AnalysisParams params;
+  params.minCount = TruncToInt32(static_cast<double>(std::min(width, height)) * 0.15);
+  return params;
+}
+
+const StageSet& ModuleStages() {
+  static constexpr StageSet kStages{ComputeProfiles, BuildEdgeMap, FindEdgePoints, EstimateAngle,
+                                    FitBox};
+  return kStages;
+}
+
 void RunAnalysis(const FrameView& frame, AnalysisHost& host, AnalysisResult& result) {
+  RunAnalysisWith(ModuleStages(), frame, host, result);
+}
+
+void RunAnalysisWith(const StageSet& stages, const FrameView& frame, AnalysisHost& host,
+                     AnalysisResult& result) {
   const int16_t width = FrameWidth(frame);
   const int16_t height = FrameHeight(frame);
-  const AnalysisParams params = MakeParams(width, height);
+  const AnalysisParams params = MakeAnalysisParams(width, height);
   if (width < kMinFrameSide || height < kMinFrameSide) {
     host.WriteEmptyFringeRecord();
     return;
@@ -89,12 +101,12 @@ void RunAnalysis(const FrameView& frame, AnalysisHost& host, AnalysisResult& res
   }
   TakeProgressStep(progress, host);
 
-  ComputeProfiles(frame, host, columns, rows, progress);
+  stages.computeProfiles(frame, host, columns, rows, progress);
   TakeProgressStep(progress, host);
   const PointD centre{ProfileCentroid(columns), ProfileCentroid(rows)};
   const PositionClass position = ClassifyPosition(columns, rows, params.flatnessThreshold);
   TakeProgressStep(progress, host);
-  BuildEdgeMap(frame, host, params.edgeThreshold, progress);
+  stages.buildEdgeMap(frame, host, params.edgeThreshold, progress);
   TakeProgressStep(progress, host);
 
   switch (position) {
@@ -112,7 +124,7 @@ void RunAnalysis(const FrameView& frame, AnalysisHost& host, AnalysisResult& res
       break;
   }
   if (position != kFlat &&
-      !FindPhotoCorners(frame, host, search, image, centre, params, progress, result)) {
+      !FindPhotoCorners(stages, frame, host, search, image, centre, params, progress, result)) {
     host.WriteEmptyFringeRecord();
     return;
   }

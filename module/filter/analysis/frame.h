@@ -10,13 +10,13 @@
 namespace Project {
 
 struct FrameView {
-  uint16_t imageMode = 0;   // host image mode (1 grayscale, 3 RGB)
-  int16_t filterCase = 0;   // 4 and 5: editable transparency
-  int16_t planes = 0;       // planes delivered per pixel
-  int16_t documentRows = 0; // document size, v
+  uint16_t imageMode = 0;       // host image mode (1 grayscale, 3 RGB)
+  int16_t filterCase = 0;       // 4 and 5: editable transparency
+  int16_t planes = 0;           // planes delivered per pixel
+  int16_t documentRows = 0;     // document size, v
   int16_t documentColumns = 0;  // document size, h
 
-  Rect inRect;              // the frame, in document coordinates
+  Rect inRect;                // the frame, in document coordinates
   uint8_t* inData = nullptr;  // holds the frame; the edge map is written into plane 0
   int32_t inRowBytes = 0;     // signed: a bottom-up buffer has a negative row distance
   int32_t inColumnBytes = 0;

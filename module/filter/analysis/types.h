@@ -29,7 +29,7 @@ struct CornerQuad {
 // never reset between runs: a run that fails early leaves the previous answer.
 struct AnalysisResult {
   CornerQuad corners;
-  double angle = 0.0;  // degrees
+  double angle = 0.0;      // degrees
   int16_t confidence = 0;  // 0, 127 or 255
 };
 
