@@ -40,8 +40,28 @@ struct Settings {
   bool byKind = false;
   bool perPage = false;
   std::string jsonFile;
-  std::string inspect;  // page name, to print its sides' profiles
+  std::string inspect;             // page name, to print its sides' profiles
+  std::vector<std::string> specs;  // single pages: kind,seed,width,height
 };
+
+// kind,seed,width,height: one page of the set's kind, as the tests make them.
+Synth::HardPageSpec ParseSpec(const std::string& text) {
+  std::stringstream in(text);
+  std::string kind, seed, width, height;
+  std::getline(in, kind, ',');
+  std::getline(in, seed, ',');
+  std::getline(in, width, ',');
+  std::getline(in, height, ',');
+  const auto k = Synth::HardKindFromName(kind);
+  if (!k || seed.empty() || width.empty() || height.empty())
+    throw CLI::ValidationError("--spec", "expected kind,seed,width,height, not \"" + text + "\"");
+  try {
+    return Synth::MakeHardPageSpec(*k, static_cast<uint32_t>(std::stoul(seed)), std::stoi(width),
+                                   std::stoi(height));
+  } catch (const std::logic_error&) {
+    throw CLI::ValidationError("--spec", "expected numbers in \"" + text + "\"");
+  }
+}
 
 std::vector<Synth::HardPageSpec> SelectSpecs(const Settings& s) {
   std::set<Synth::HardKind> wanted;
@@ -107,6 +127,16 @@ int Run(const Settings& s) {
     Refine::PipelineOptions pageOptions = options;
     if (c.name == s.inspect) pageOptions.refinement.inspect = PrintSide;
     outcomes.push_back(Accuracy::RunCase(*detector, c, pageOptions));
+    if (c.name == s.inspect) {
+      auto print = [](const char* what, const Refine::Quad& q) {
+        std::printf("%-8s", what);
+        for (const auto& p : q) std::printf(" (%.2f, %.2f)", p.x, p.y);
+        std::printf("\n");
+      };
+      print("truth", c.truth.corners);
+      print("module", outcomes.back().rawAnswer.corners);
+      print("refined", outcomes.back().refinedAnswer.corners);
+    }
     const Accuracy::PageOutcome& o = outcomes.back();
     if (s.perPage) std::fprintf(stderr, "%s\n", Accuracy::PageLine(o).c_str());
     if (json.is_open()) {
@@ -116,6 +146,7 @@ int Run(const Settings& s) {
           {"module", ScoreJson(o.raw)},
           {"refined", ScoreJson(o.refined)},
           {"status", o.status},
+          {"sides", o.sides},
           {"preparations", o.preparations},
           {"times_ms", {{"detect", o.detectMs}, {"prepare", o.prepareMs}, {"refine", o.refineMs}}}};
       json << j.dump() << '\n';
@@ -129,7 +160,8 @@ int Run(const Settings& s) {
     for (const auto& file : files) score(Accuracy::FolderCase(file));
     source = std::to_string(files.size()) + " pages from " + s.pages;
   } else {
-    const auto specs = SelectSpecs(s);
+    auto specs = SelectSpecs(s);
+    for (const std::string& text : s.specs) specs.push_back(ParseSpec(text));
     for (const auto& spec : specs) {
       const Accuracy::PageCase c = Accuracy::GeneratedCase(spec);
       if (!s.write.empty()) Accuracy::WriteCase(c, s.write);
@@ -183,11 +215,15 @@ int main(int argc, char** argv) {
   app.add_flag("--by-kind", s.byKind, "Add a table kind by kind");
   app.add_flag("--per-page", s.perPage, "A line per page on standard error");
   app.add_option("--json", s.jsonFile, "Write one JSON object per page to this file");
+  app.add_option("--spec", s.specs,
+                 "Also score this page of the set: kind,seed,width,height (diagnostics)")
+      ->excludes(pages);
   app.add_option("--inspect", s.inspect,
                  "Print the profiles across each side of the named page (diagnostics)");
   try {
     app.parse(argc, argv);
-    if (s.generate == 0 && s.pages.empty()) throw CLI::RequiredError("--generate or --pages");
+    if (s.generate == 0 && s.pages.empty() && s.specs.empty())
+      throw CLI::RequiredError("--generate or --pages");
   } catch (const CLI::ParseError& e) {
     const int code = app.exit(e);
     return code == 0 ? kExitOk : kExitUsage;

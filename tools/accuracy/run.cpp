@@ -27,9 +27,15 @@ PageOutcome RunCase(Refine::Detector& detector, const PageCase& c,
   PageOutcome o;
   o.name = c.name;
   o.kind = c.truth.kind;
-  o.raw = ScoreAnswer(c.truth, RawAnswerOf(result.raw));
-  o.refined = ScoreAnswer(c.truth, RefinedAnswerOf(result.refined));
+  o.rawAnswer = RawAnswerOf(result.raw);
+  o.refinedAnswer = RefinedAnswerOf(result.refined);
+  o.raw = ScoreAnswer(c.truth, o.rawAnswer);
+  o.refined = ScoreAnswer(c.truth, o.refinedAnswer);
   o.status = std::string(Refine::StatusName(result.refined.status));
+  for (size_t k = 0; k < 4; ++k) {
+    const Refine::SideResult& side = result.refined.sides[k];
+    o.sides[k] = std::string(Refine::StatusName(side.status)) + ": " + side.note;
+  }
   for (const auto& p : result.preparations) o.preparations.push_back(p.kind);
   o.detectMs = result.detectSeconds * 1e3;
   o.prepareMs = result.prepareSeconds * 1e3;

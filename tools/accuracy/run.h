@@ -2,6 +2,7 @@
 // refinement, each answer scored against the page's truth.
 #pragma once
 
+#include <array>
 #include <functional>
 #include <string>
 #include <vector>
@@ -15,9 +16,11 @@ namespace Accuracy {
 struct PageOutcome {
   std::string name;
   std::string kind;
-  Score raw;           // the module's answer on the page as it is
-  Score refined;       // after preparation and refinement
-  std::string status;  // refinement status
+  Score raw;      // the module's answer on the page as it is
+  Score refined;  // after preparation and refinement
+  Answer rawAnswer, refinedAnswer;
+  std::string status;                // refinement status
+  std::array<std::string, 4> sides;  // each side's status and what decided it
   std::vector<std::string> preparations;
   double detectMs = 0.0, prepareMs = 0.0, refineMs = 0.0;
 };

@@ -72,13 +72,17 @@ AlignedProfile AlignProfiles(const ProfileStrip& strip, double maxSlope) {
   if (strip.lines < 2 || width < 3) return out;
   out.tCentre = 0.5 * (strip.t.front() + strip.t.back());
 
-  // Group means: each group is short enough that a small slope does not blur it.
-  const int groupCount = std::clamp(strip.lines / 6, 1, 12);
+  // Groups of neighbouring lines, short enough that a small slope does not
+  // blur them: their means, and later their roughness.
+  const int groupCount = std::clamp(strip.lines / 4, 1, 12);
+  std::vector<int> groupFirst(static_cast<size_t>(groupCount) + 1);
+  for (int g = 0; g <= groupCount; ++g)
+    groupFirst[static_cast<size_t>(g)] = g * strip.lines / groupCount;
   std::vector<std::vector<double>> groups(static_cast<size_t>(groupCount));
   std::vector<double> groupT(static_cast<size_t>(groupCount), 0.0);
   for (int g = 0; g < groupCount; ++g) {
-    const int first = g * strip.lines / groupCount;
-    const int last = (g + 1) * strip.lines / groupCount;
+    const int first = groupFirst[static_cast<size_t>(g)];
+    const int last = groupFirst[static_cast<size_t>(g) + 1];
     auto& mean = groups[static_cast<size_t>(g)];
     mean.assign(static_cast<size_t>(width), kNaN);
     for (int k = 0; k < width; ++k) {
@@ -99,10 +103,10 @@ AlignedProfile AlignProfiles(const ProfileStrip& strip, double maxSlope) {
   // Slope search: structures at s = s0 + b (t - tCentre) appear in group g at
   // index k + b (t_g - tCentre) / step.
   double bestSlope = 0.0;
+  std::vector<double> shift(static_cast<size_t>(groupCount), 0.0);
   if (groupCount >= 3 && maxSlope > 0.0) {
-    constexpr int kSteps = 10;
+    constexpr int kSteps = 3;
     std::vector<double> scores;
-    std::vector<double> shift(static_cast<size_t>(groupCount));
     for (int i = -kSteps; i <= kSteps; ++i) {
       const double b = maxSlope * i / kSteps;
       for (int g = 0; g < groupCount; ++g)
@@ -123,32 +127,54 @@ AlignedProfile AlignProfiles(const ProfileStrip& strip, double maxSlope) {
     bestSlope = maxSlope * (best - kSteps + refine) / kSteps;
   }
   out.slope = bestSlope;
+  for (int g = 0; g < groupCount; ++g)
+    shift[static_cast<size_t>(g)] =
+        bestSlope * (groupT[static_cast<size_t>(g)] - out.tCentre) / strip.sStep;
 
-  // Aligned median and roughness over all lines. Medians, so that dust, hairs
-  // and specks on a few lines leave the profile alone.
-  std::vector<double> shifts(static_cast<size_t>(strip.lines));
-  for (int line = 0; line < strip.lines; ++line)
-    shifts[static_cast<size_t>(line)] =
-        bestSlope * (strip.t[static_cast<size_t>(line)] - out.tCentre) / strip.sStep;
-  std::vector<double> values, steps;
-  values.reserve(static_cast<size_t>(strip.lines));
-  steps.reserve(static_cast<size_t>(strip.lines));
+  // Roughness of each group: the mean |difference| between its neighbouring
+  // lines, each line lined up with the structures.
+  std::vector<std::vector<double>> groupRough(static_cast<size_t>(groupCount));
+  for (int g = 0; g < groupCount; ++g) {
+    const int first = groupFirst[static_cast<size_t>(g)];
+    const int last = groupFirst[static_cast<size_t>(g) + 1];
+    auto& rough = groupRough[static_cast<size_t>(g)];
+    rough.assign(static_cast<size_t>(width), kNaN);
+    if (last - first < 2) continue;
+    for (int k = 0; k < width; ++k) {
+      double sum = 0.0;
+      int n = 0;
+      double previous = kNaN;
+      for (int line = first; line < last; ++line) {
+        const double at =
+            k + bestSlope * (strip.t[static_cast<size_t>(line)] - out.tCentre) / strip.sStep;
+        const double v = InterpolateLine(strip, line, at);
+        if (!std::isnan(v) && !std::isnan(previous)) {
+          sum += std::abs(v - previous);
+          ++n;
+        }
+        previous = v;
+      }
+      // For two values with independent noise sigma, E|difference| = 1.128 sigma.
+      if (n > 0) rough[static_cast<size_t>(k)] = sum / n / 1.128;
+    }
+  }
+
+  // The typical profile: medians over the groups, so that dust, hairs and
+  // specks on a few lines leave it alone.
+  std::vector<double> values, roughs;
   for (int k = 0; k < width; ++k) {
     values.clear();
-    steps.clear();
-    double previous = kNaN;
-    for (int line = 0; line < strip.lines; ++line) {
-      const double v = InterpolateLine(strip, line, k + shifts[static_cast<size_t>(line)]);
-      if (!std::isnan(v)) {
-        values.push_back(v);
-        if (!std::isnan(previous)) steps.push_back(std::abs(v - previous));
-      }
-      previous = v;
+    roughs.clear();
+    for (int g = 0; g < groupCount; ++g) {
+      const double v =
+          Interpolate(groups[static_cast<size_t>(g)], k + shift[static_cast<size_t>(g)]);
+      if (!std::isnan(v)) values.push_back(v);
+      const double r = groupRough[static_cast<size_t>(g)][static_cast<size_t>(k)];
+      if (!std::isnan(r)) roughs.push_back(r);
     }
-    if (2 * static_cast<int>(values.size()) < strip.lines || values.empty()) continue;
+    if (values.empty() || 2 * static_cast<int>(values.size()) < groupCount) continue;
     out.mean[static_cast<size_t>(k)] = MedianOf(values);
-    // For two values with independent noise sigma, the median |difference| is 0.954 sigma.
-    if (!steps.empty()) out.roughness[static_cast<size_t>(k)] = MedianOf(steps) / 0.954;
+    if (!roughs.empty()) out.roughness[static_cast<size_t>(k)] = MedianOf(roughs);
   }
 
   // Noise: the calmest stretch of roughness.

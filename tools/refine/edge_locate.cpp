@@ -1,6 +1,7 @@
 // Half-pixel profiles, steepest point of the expected polarity, parabola.
 #include "refine/edge_locate.h"
 
+#include <algorithm>
 #include <cmath>
 
 namespace Refine {
@@ -21,16 +22,18 @@ std::vector<FitSample> LocateEdges(const GraySampler& sampler, const SampleArea&
   for (const double at : t) {
     const double expected = request.offset + request.slope * (at - request.tCentre);
     bool ok = true;
-    for (int i = 0; i < count && ok; ++i) {
-      const double s = expected + (i - reach) * kStep;
-      double sum = 0.0;
-      for (int m = -half; m <= half && ok; ++m) {
-        const Vec2 p = frame.At(at + m, s);
-        double v = 0.0;
-        ok = area.Contains(p) && sampler.Sample(p.x, p.y, v);
-        sum += v;
+    std::fill(values.begin(), values.end(), 0.0);
+    for (int m = -half; m <= half && ok; ++m) {
+      const Vec2 first = frame.At(at + m, expected - reach * kStep);
+      const Vec2 last = frame.At(at + m, expected + reach * kStep);
+      // The run is straight: both ends inside means every point inside.
+      ok = area.Contains(first) && area.Contains(last) && sampler.Inside(first.x, first.y) &&
+           sampler.Inside(last.x, last.y);
+      const Vec2 step = frame.outward * kStep;
+      for (int i = 0; i < count && ok; ++i) {
+        const Vec2 p = first + step * i;
+        values[static_cast<size_t>(i)] += sampler.SampleInside(p.x, p.y) * scale;
       }
-      values[static_cast<size_t>(i)] = sum * scale;
     }
     if (!ok) continue;
     // Slope over one pixel, signed so that the expected step is positive.

@@ -3,12 +3,14 @@
 #include "refine/lid_level.h"
 
 #include <algorithm>
+#include <array>
 #include <cmath>
+#include <cstdlib>
 
 namespace Refine {
 namespace {
 
-constexpr int kBlock = 24;
+constexpr int kBlock = 16;
 constexpr double kWhite = 245.0;
 
 struct Block {
@@ -62,39 +64,58 @@ bool FitSurface(const std::vector<Block>& blocks, const std::vector<double>& wei
   return true;
 }
 
+// The median of values 0 ... 765 counted in a histogram.
+int HistogramMedian(const std::array<uint16_t, 766>& counts, int total) {
+  int seen = 0;
+  for (int v = 0; v < 766; ++v) {
+    seen += counts[static_cast<size_t>(v)];
+    if (2 * seen > total) return v;
+  }
+  return 765;
+}
+
+// A pixel's channel sum, gray pages counted three times, so that one scale
+// (0 ... 765) serves both.
+int Sum3(const PageImage& page, int x, int y) {
+  const uint8_t* p = page.pixels + static_cast<std::ptrdiff_t>(y) * page.rowBytes +
+                     static_cast<std::ptrdiff_t>(x) * page.pixelBytes;
+  return page.channels == 1 ? 3 * p[0] : p[0] + p[1] + p[2];
+}
+
 }  // namespace
 
 LidEstimate EstimateLid(const PageImage& page) {
   LidEstimate out;
   if (!CheckPageImage(page).empty() || page.width < 2 * kBlock || page.height < 2 * kBlock)
     return out;
-  const GraySampler g(page);
-  const int across = std::clamp(page.width / 100, 4, 24);
-  const int down = std::clamp(page.height / 100, 4, 24);
+  const int across = std::clamp(page.width / 120, 4, 16);
+  const int down = std::clamp(page.height / 120, 4, 16);
   std::vector<Block> blocks;
-  std::vector<double> values, steps;
+  std::array<uint16_t, 766> values{};
+  std::array<uint16_t, 766> steps{};
   for (int by = 0; by < down; ++by) {
     for (int bx = 0; bx < across; ++bx) {
       const int x0 = static_cast<int>((bx + 0.5) * page.width / across) - kBlock / 2;
       const int y0 = static_cast<int>((by + 0.5) * page.height / down) - kBlock / 2;
-      values.clear();
-      steps.clear();
+      values.fill(0);
+      steps.fill(0);
       for (int y = y0; y < y0 + kBlock; ++y) {
-        double previous = g.Pixel(x0, y);
-        for (int x = x0; x < x0 + kBlock; ++x) {
-          const double v = g.Pixel(x, y);
-          values.push_back(v);
-          if (x > x0) steps.push_back(std::abs(v - previous));
+        int previous = Sum3(page, x0, y);
+        ++values[static_cast<size_t>(previous)];
+        for (int x = x0 + 1; x < x0 + kBlock; ++x) {
+          const int v = Sum3(page, x, y);
+          ++values[static_cast<size_t>(v)];
+          ++steps[static_cast<size_t>(std::abs(v - previous))];
           previous = v;
         }
       }
       Block b;
       b.u = (x0 + kBlock * 0.5) / page.width;
       b.v = (y0 + kBlock * 0.5) / page.height;
-      b.median = Nth(values, 0.5);
+      b.median = HistogramMedian(values, kBlock * kBlock) / 3.0;
       // Median |difference| of two neighbours is 0.954 sigma; rounding to
       // whole gray levels leaves a floor of about a quarter level.
-      b.noise = std::max(Nth(steps, 0.5) / 0.954, 0.25);
+      b.noise = std::max(HistogramMedian(steps, kBlock * (kBlock - 1)) / 3.0 / 0.954, 0.25);
       blocks.push_back(b);
     }
   }

@@ -18,20 +18,37 @@ std::string CheckPageImage(const PageImage& page) {
 }
 
 bool GraySampler::Sample(double x, double y, double& value) const {
-  if (!(x >= 0.0) || !(y >= 0.0)) return false;  // also rejects NaN
-  const double maxX = static_cast<double>(page_.width - 1);
-  const double maxY = static_cast<double>(page_.height - 1);
-  if (x > maxX || y > maxY) return false;
-  auto x0 = static_cast<int32_t>(x);
-  auto y0 = static_cast<int32_t>(y);
+  if (!Inside(x, y)) return false;  // also rejects NaN
+  value = SampleInside(x, y);
+  return true;
+}
+
+double GraySampler::SampleInside(double x, double y) const {
+  const auto x0 = static_cast<int32_t>(x);
+  const auto y0 = static_cast<int32_t>(y);
   const double fx = x - x0;
   const double fy = y - y0;
-  const int32_t x1 = x0 + 1 < page_.width ? x0 + 1 : x0;
-  const int32_t y1 = y0 + 1 < page_.height ? y0 + 1 : y0;
-  const double top = Pixel(x0, y0) + (Pixel(x1, y0) - Pixel(x0, y0)) * fx;
-  const double bottom = Pixel(x0, y1) + (Pixel(x1, y1) - Pixel(x0, y1)) * fx;
-  value = top + (bottom - top) * fy;
-  return true;
+  const uint8_t* p = page_.pixels + static_cast<std::ptrdiff_t>(y0) * page_.rowBytes +
+                     static_cast<std::ptrdiff_t>(x0) * page_.pixelBytes;
+  // On the last column or row the neighbour is the pixel itself.
+  const std::ptrdiff_t right = x0 + 1 < page_.width ? page_.pixelBytes : 0;
+  const std::ptrdiff_t down = y0 + 1 < page_.height ? page_.rowBytes : 0;
+  double a, b, c, d;
+  if (page_.channels == 1) {
+    a = p[0];
+    b = p[right];
+    c = p[down];
+    d = p[down + right];
+  } else {
+    a = p[0] + p[1] + p[2];
+    b = p[right] + p[right + 1] + p[right + 2];
+    c = p[down] + p[down + 1] + p[down + 2];
+    d = p[down + right] + p[down + right + 1] + p[down + right + 2];
+  }
+  const double top = a + (b - a) * fx;
+  const double bottom = c + (d - c) * fx;
+  const double value = top + (bottom - top) * fy;
+  return page_.channels == 1 ? value : value * (1.0 / 3.0);
 }
 
 }  // namespace Refine

@@ -39,6 +39,14 @@ class GraySampler {
   // Bilinear value at (x, y); false when the point lies outside the pixel centres' hull.
   bool Sample(double x, double y, double& value) const;
 
+  // True when (x, y) lies inside the pixel centres' hull.
+  bool Inside(double x, double y) const {
+    return x >= 0.0 && y >= 0.0 && x <= page_.width - 1 && y <= page_.height - 1;
+  }
+
+  // Bilinear value at a point known to be Inside.
+  double SampleInside(double x, double y) const;
+
  private:
   PageImage page_;
 };

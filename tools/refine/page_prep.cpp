@@ -65,14 +65,18 @@ int FindBedStrip(const GraySampler& g, int edge, double lid) {
   const int depth = std::min(across / 5, 400);
   if (depth < 16) return 0;
   const double dark = std::min(0.55 * lid, lid - 60.0);
-  std::vector<double> median(static_cast<size_t>(depth));
-  for (int d = 0; d < depth; ++d)
-    median[static_cast<size_t>(d)] = SampleEdgeLine(g, edge, d).median;
-  if (median[0] >= dark) return 0;
-  const double bed = std::min({median[0], median[1], median[2]});
+  // Most pages have no strip: the outermost line tells at once.
+  std::vector<double> median;
+  auto lineMedian = [&](int d) {
+    while (static_cast<int>(median.size()) <= d)
+      median.push_back(SampleEdgeLine(g, edge, static_cast<int>(median.size())).median);
+    return median[static_cast<size_t>(d)];
+  };
+  if (lineMedian(0) >= dark) return 0;
+  const double bed = std::min({lineMedian(0), lineMedian(1), lineMedian(2)});
   const double half = 0.5 * (bed + lid);
   int w = 0;
-  while (w < depth && median[static_cast<size_t>(w)] < half) ++w;
+  while (w < depth && lineMedian(w) < half) ++w;
   if (w < 2 || w + 12 > depth) return 0;
   // The strip runs the whole edge: nearly every sample of its middle line is dark.
   const EdgeLine middle = SampleEdgeLine(g, edge, w / 2);
@@ -81,7 +85,7 @@ int FindBedStrip(const GraySampler& g, int edge, double lid) {
   if (static_cast<double>(darkCount) < 0.8 * static_cast<double>(middle.samples.size())) return 0;
   // And the lid follows it.
   for (int d = w + 3; d < w + 12; ++d)
-    if (median[static_cast<size_t>(d)] < dark) return 0;
+    if (lineMedian(d) < dark) return 0;
   return w + 4;  // past the strip's soft edge
 }
 

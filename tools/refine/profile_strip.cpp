@@ -1,6 +1,7 @@
 // Sampling of profiles across a side.
 #include "refine/profile_strip.h"
 
+#include <algorithm>
 #include <limits>
 
 namespace Refine {
@@ -17,21 +18,36 @@ ProfileStrip SampleStrip(const GraySampler& sampler, const SampleArea& area, con
   strip.values.assign(static_cast<size_t>(strip.lines) * static_cast<size_t>(width),
                       std::numeric_limits<float>::quiet_NaN());
   const int half = smear / 2;
-  const double scale = 1.0 / (2 * half + 1);
+  const float scale = 1.0f / static_cast<float>(2 * half + 1);
+  std::vector<double> sum(static_cast<size_t>(width));
+  std::vector<char> ok(static_cast<size_t>(width));
   for (int line = 0; line < strip.lines; ++line) {
-    float* out = strip.values.data() + static_cast<size_t>(line) * static_cast<size_t>(width);
-    for (int k = 0; k < width; ++k) {
-      const double s = sFrom + sStep * k;
-      double sum = 0.0;
-      bool ok = true;
-      for (int m = -half; m <= half && ok; ++m) {
-        const Vec2 p = frame.At(t[static_cast<size_t>(line)] + m, s);
+    std::fill(sum.begin(), sum.end(), 0.0);
+    std::fill(ok.begin(), ok.end(), 1);
+    for (int m = -half; m <= half; ++m) {
+      const double along = t[static_cast<size_t>(line)] + m;
+      const Vec2 first = frame.At(along, sFrom);
+      const Vec2 last = frame.At(along, sFrom + sStep * (width - 1));
+      const Vec2 step = frame.outward * sStep;
+      // A straight run with both ends inside the area and the page lies
+      // wholly inside: no test per value.
+      const bool inside = area.Contains(first) && area.Contains(last) &&
+                          sampler.Inside(first.x, first.y) && sampler.Inside(last.x, last.y);
+      for (int k = 0; k < width; ++k) {
+        const Vec2 p = first + step * k;
         double v = 0.0;
-        ok = area.Contains(p) && sampler.Sample(p.x, p.y, v);
-        sum += v;
+        if (inside) {
+          v = sampler.SampleInside(p.x, p.y);
+        } else if (!area.Contains(p) || !sampler.Sample(p.x, p.y, v)) {
+          ok[static_cast<size_t>(k)] = 0;
+        }
+        sum[static_cast<size_t>(k)] += v;
       }
-      if (ok) out[k] = static_cast<float>(sum * scale);
     }
+    float* out = strip.values.data() + static_cast<size_t>(line) * static_cast<size_t>(width);
+    for (int k = 0; k < width; ++k)
+      if (ok[static_cast<size_t>(k)])
+        out[k] = static_cast<float>(sum[static_cast<size_t>(k)]) * scale;
   }
   return strip;
 }

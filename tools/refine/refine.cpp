@@ -19,6 +19,9 @@ namespace Refine {
 namespace {
 
 constexpr double kDegree = std::numbers::pi / 180.0;
+// A photo shows at least one side clearly against the lid; faint steps
+// alone are the lid's own shading or texture.
+constexpr double kClearStep = 12.0;
 
 struct SideWork {
   SideFrame frame;
@@ -66,7 +69,7 @@ int SmearFor(double noise) {
 AlignedProfile MeasureSide(const GraySampler& sampler, const SampleArea& area, const SideWork& work,
                            double sFrom, double sTo) {
   const double length = work.frame.length;
-  const int lines = std::clamp(static_cast<int>(length / 6.0), 16, 120);
+  const int lines = std::clamp(static_cast<int>(length / 16.0), 16, 32);
   const auto t = SpreadPositions(work.trim, length - work.trim, lines);
   const int width = static_cast<int>(std::floor(sTo - sFrom)) + 1;
   const ProfileStrip strip = SampleStrip(sampler, area, work.frame, t, sFrom, 1.0, width);
@@ -103,7 +106,7 @@ void PlaceSide(const GraySampler& sampler, const SampleArea& area, SideWork& wor
   request.smear = SmearFor(reading.noise);
   const double lineNoise = reading.noise / std::sqrt(static_cast<double>(request.smear));
   request.minGradient = std::max({2.0, 3.0 * lineNoise, 0.25 * reading.gradient});
-  const int fineLines = std::clamp(static_cast<int>(length / 2.0), 20, 500);
+  const int fineLines = std::clamp(static_cast<int>(length / 5.0), 20, 160);
   const auto tFine = SpreadPositions(work.trim, length - work.trim, fineLines);
   const auto samples = LocateEdges(sampler, area, frame, tFine, request);
   const LineFitResult fit = FitLineRobust(samples);
@@ -146,6 +149,27 @@ void PlaceSide(const GraySampler& sampler, const SampleArea& area, SideWork& wor
         innerFit.rms <= 1.5)
       work.inner = LineInFrame(frame, innerFit.offset, innerFit.slope);
   }
+}
+
+// The picture's edge about `width` inside a side placed on the paper's edge.
+std::optional<Line> FindInnerEdge(const GraySampler& sampler, const SampleArea& area,
+                                  const SideWork& work, double width) {
+  const SideReading& r = work.reading;
+  LocateRequest request;
+  request.offset = r.offset - width;
+  request.slope = r.slope;
+  request.tCentre = r.tCentre;
+  request.polarity = 1;  // the picture is darker than its white margin
+  request.window = std::max(2.5, 0.1 * width);
+  request.smear = SmearFor(r.noise);
+  request.minGradient =
+      std::max(2.0, 3.0 * r.noise / std::sqrt(static_cast<double>(request.smear)));
+  const int lines = std::clamp(static_cast<int>(work.frame.length / 5.0), 20, 160);
+  const auto t = SpreadPositions(work.trim, work.frame.length - work.trim, lines);
+  const LineFitResult fit = FitLineRobust(LocateEdges(sampler, area, work.frame, t, request));
+  if (!fit.ok || static_cast<double>(fit.inliers) / lines < 0.3 || fit.rms > 1.5)
+    return std::nullopt;
+  return LineInFrame(work.frame, fit.offset, fit.slope);
 }
 
 double MidShiftBetween(const SideFrame& frame, const Line& outer, const Line& inner) {
@@ -265,7 +289,10 @@ Refinement RefineOutline(const PageImage& page, const ModuleAnswer& answer,
   const GraySampler sampler(page);
   const double across = std::min(Distance(answer.corners[0], answer.corners[1]),
                                  Distance(answer.corners[1], answer.corners[2]));
+  // Outward far enough for a white margin and its shadow; inward only as far
+  // as a shadow band reaches (a side far inside is looked for again wider).
   const double reach = std::clamp(std::round(0.12 * across), 40.0, 200.0);
+  const double reachIn = std::clamp(std::round(0.05 * across), 24.0, 100.0);
   // maxMargin stays inside the first search band so that a margin's outer edge is seen there.
   const double maxMargin = options.findMargin ? std::min(reach - 12.0, 0.12 * across) : 0.0;
 
@@ -282,7 +309,7 @@ Refinement RefineOutline(const PageImage& page, const ModuleAnswer& answer,
     }
     // Far enough in and out to meet the paper's edge even where the module
     // took its side from a shadow, a margin or dust.
-    w.profile = MeasureSide(sampler, area, w, -reach, reach);
+    w.profile = MeasureSide(sampler, area, w, -reachIn, reach);
   }
   // The page's noise: the calmest side's (the lid is the same all round).
   double pageNoise = 0.0;
@@ -319,6 +346,18 @@ Refinement RefineOutline(const PageImage& page, const ModuleAnswer& answer,
         w.reading = again;
       }
     }
+    if (w.reading.found && !w.reading.pageEdge && w.reading.paleInside && !w.reading.margin &&
+        maxMargin > 0.0) {
+      // A pale calm stretch inside the paper's edge that runs past the first
+      // band: look deeper in for where the picture begins.
+      const double deeper = std::max(reachIn, maxMargin + 12.0 - w.reading.offset);
+      AlignedProfile deep = MeasureSide(sampler, area, w, -deeper, reach);
+      SideReading again = ReadSide(deep, readOptions);
+      if (again.found && again.margin && std::abs(again.offset - w.reading.offset) <= 1.5) {
+        w.profile = std::move(deep);
+        w.reading = again;
+      }
+    }
     if (options.inspect) options.inspect(k, w.profile, w.reading);
     PlaceSide(sampler, area, w);
   }
@@ -344,10 +383,19 @@ Refinement RefineOutline(const PageImage& page, const ModuleAnswer& answer,
         innerLines[k] = w.inner;
         continue;
       }
+      const bool placed =
+          w.result.status == SideStatus::kRefined || w.result.status == SideStatus::kCoarse;
+      const Line& l = w.result.line;
+      if (placed && (w.reading.band || w.reading.polarity < 0)) {
+        // The side found is the paper's own edge (brighter than the lid, or
+        // behind its shadow): the picture begins a margin further in.
+        innerLines[k] = FindInnerEdge(sampler, area, w, width)
+                            .value_or(Line{l.point - w.frame.outward * width, l.direction});
+        continue;
+      }
       // The side found is the picture's edge; the paper's lies a margin further out.
-      innerLines[k] = w.result.line;
-      if (w.result.status == SideStatus::kRefined || w.result.status == SideStatus::kCoarse) {
-        const Line& l = w.result.line;
+      innerLines[k] = l;
+      if (placed) {
         w.result.line = Line{l.point + w.frame.outward * width, l.direction};
         w.result.status = SideStatus::kInferred;
         w.result.note = "margin too faint to see; width taken from the other sides";
@@ -357,17 +405,20 @@ Refinement RefineOutline(const PageImage& page, const ModuleAnswer& answer,
 
   std::array<Line, 4> lines{};
   int refined = 0;
-  int edges = 0;  // sides placed on a step seen in the page
+  int clear = 0;  // sides placed on a clear step seen in the page
   for (int k = 0; k < 4; ++k) {
     lines[k] = work[k].result.line;
     out.sides[k] = work[k].result;
     const SideStatus status = work[k].result.status;
     if (status != SideStatus::kKept) ++refined;
-    if (status == SideStatus::kRefined || status == SideStatus::kCoarse ||
-        status == SideStatus::kInferred)
-      ++edges;
+    // A margin with the picture inside it, or the lid's shadow band, is as
+    // clear as a strong step.
+    const SideReading& r = work[k].reading;
+    if ((status == SideStatus::kRefined || status == SideStatus::kCoarse) &&
+        (work[k].result.contrast >= kClearStep || r.margin || r.band))
+      ++clear;
   }
-  if (edges == 0) {
+  if (clear == 0) {
     // Not one side of the module's outline lies on a step in the page: what
     // it found is lid texture, noise or the page's own edge.
     out.status = RefineStatus::kNoPhoto;

@@ -95,8 +95,8 @@ class Reader {
     calm_ = options.pageNoise > 0.0 ? options.pageNoise : profile.noise;
     // A median of n values scatters about 1.25 sigma / sqrt(n).
     const double meanNoise = 1.25 * calm_ / std::sqrt(std::max(1, profile.lines));
-    gradThreshold_ = std::max(1.0, 5.0 * meanNoise);
-    stepThreshold_ = std::max(3.0, 8.0 * meanNoise);
+    gradThreshold_ = std::max(0.6, 3.0 * meanNoise);
+    stepThreshold_ = std::max(1.5, 8.0 * meanNoise);
     FindLid();
     FindCandidates();
   }
@@ -271,8 +271,10 @@ class Reader {
   // different inside it.
   bool IsBand(double innerK, double outerK) const {
     // Calm, or at least far calmer than the picture inside it (a compressed
-    // page rings inside a narrow band).
-    const double bandRough = roughSeries_.Median(innerK + 1.0, outerK - 1.0);
+    // page rings inside a narrow band). Raw roughness: smoothing would spread
+    // the two steps' roughness over a narrow band.
+    const Series raw(p_.roughness);
+    const double bandRough = raw.Median(innerK + 1.0, outerK - 1.0);
     const double insideRough = roughSeries_.Median(innerK - 8.0, innerK - 2.0);
     if (std::isnan(bandRough)) return false;
     const bool calm =
@@ -281,9 +283,14 @@ class Reader {
     if (!calm) return false;
     const double level = mean_.Mean(innerK + 1.0, outerK - 1.0);
     if (std::isnan(level) || level > lid_ - std::max(10.0, 0.08 * lid_)) return false;
-    const double inside = mean_.Mean(innerK - 6.0, innerK - 2.0);
-    if (std::isnan(inside)) return false;
-    return std::abs(inside - level) >= 8.0 || !Smooth(innerK - 6.0, innerK - 2.0);
+    // Something else lies inside: another level, or a rougher page. Looked at
+    // a little way in, so that a thin line in the picture, with the same
+    // calm level on both sides of it, is not taken for the paper's edge.
+    const double inside = mean_.Mean(innerK - 10.0, innerK - 4.0);
+    const double insideFarRough = raw.Median(innerK - 10.0, innerK - 4.0);
+    if (std::isnan(inside) || std::isnan(insideFarRough)) return false;
+    return std::abs(inside - level) >= 8.0 ||
+           insideFarRough >= std::max(CalmLimit(), 2.0 * bandRough);
   }
 
   void FindMargin(const Candidate& edge, SideReading& r) const {
@@ -291,6 +298,7 @@ class Reader {
     const double level = mean_.Mean(edge.k - 8.0, edge.k - 2.0);
     if (std::isnan(level) || !Smooth(edge.k - 8.0, edge.k - 2.0)) return;
     if (level < std::max(lid_ - 6.0, 170.0)) return;
+    r.paleInside = true;
     for (const Candidate& c : candidates_) {
       if (c.k >= edge.k - 3.0) continue;
       if (c.k < edge.k - options_.maxMarginWidth / p_.sStep) break;

@@ -21,7 +21,8 @@ struct SideReading {
   bool pageEdge = false;  // the paper runs on past the sampled area
   bool band = false;      // a shadow band lies just outside
   double bandWidth = 0.0;
-  bool margin = false;  // a white paper margin lies inside the edge
+  bool paleInside = false;  // calm and bright just inside the edge, as a margin is
+  bool margin = false;      // a white paper margin lies inside the edge
   double innerOffset = 0.0;
   int innerPolarity = 0;
   double lid = 0.0;          // lid level outside the edge
