@@ -4,7 +4,14 @@ if(CMAKE_CROSSCOMPILING)
   set(INSTALL_GTEST OFF CACHE BOOL "" FORCE)
   set(BUILD_GMOCK OFF CACHE BOOL "" FORCE)
   set(gtest_force_shared_crt ON CACHE BOOL "" FORCE)
+  # GoogleTest is built with the project's code-generation flags but not with
+  # its warnings-as-errors, which are meant for our own code.
+  get_directory_property(fringe_saved_options COMPILE_OPTIONS)
+  set(fringe_gtest_options ${fringe_saved_options})
+  list(FILTER fringe_gtest_options EXCLUDE REGEX "^-W")
+  set_directory_properties(PROPERTIES COMPILE_OPTIONS "${fringe_gtest_options}")
   add_subdirectory(/usr/src/googletest ${CMAKE_BINARY_DIR}/googletest EXCLUDE_FROM_ALL SYSTEM)
+  set_directory_properties(PROPERTIES COMPILE_OPTIONS "${fringe_saved_options}")
   # Newer GoogleTest sources name their targets GTest::* themselves.
   if(NOT TARGET GTest::gtest)
     add_library(GTest::gtest ALIAS gtest)

@@ -17,9 +17,9 @@ constexpr size_t kItem = 16;
 
 template <typename T>
 void Append(std::vector<uint8_t>& bytes, T value) {
-  uint8_t raw[sizeof(T)];
-  std::memcpy(raw, &value, sizeof(T));
-  bytes.insert(bytes.end(), raw, raw + sizeof(T));
+  size_t at = bytes.size();
+  bytes.resize(at + sizeof(T));
+  std::memcpy(bytes.data() + at, &value, sizeof(T));
 }
 
 template <typename T>

@@ -78,7 +78,13 @@ void FaultPlan::FailAt(Proc proc, int32_t failAt, int32_t failTimes, int32_t err
   entry.fault.failAt = failAt;
   entry.fault.failTimes = failTimes;
   entry.fault.error = error;
+  entry.fault.raise = false;
   entry.base = entry.calls;
+}
+
+void FaultPlan::RaiseAt(Proc proc, int32_t raiseAt) {
+  FailAt(proc, raiseAt);
+  Slot(proc).fault.raise = true;
 }
 
 void FaultPlan::Restore(Proc proc) {
@@ -95,6 +101,9 @@ std::optional<int32_t> FaultPlan::Count(Proc proc) {
   int32_t nth = entry.calls - entry.base;
   if (nth < fault.failAt) return std::nullopt;
   if (fault.failTimes >= 0 && nth >= fault.failAt + fault.failTimes) return std::nullopt;
+  if (fault.raise) {
+    throw HostRaised(std::string("the host's ") + ProcName(proc) + " raised an exception");
+  }
   return fault.error;
 }
 

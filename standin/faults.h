@@ -6,6 +6,8 @@
 #include <array>
 #include <cstdint>
 #include <optional>
+#include <stdexcept>
+#include <string>
 
 namespace Standin {
 
@@ -73,6 +75,15 @@ struct Fault {
   int32_t failAt = 0;     // 1-based call (counted from when the fault was set); 0: never
   int32_t failTimes = 1;  // calls failing from there on; negative: all later calls
   int32_t error = -108;
+  // Instead of answering, the failing call throws HostRaised into the module:
+  // a host written in C++ that lets an exception escape from a callback.
+  bool raise = false;
+};
+
+// What a procedure scheduled to raise throws.
+class HostRaised : public std::runtime_error {
+ public:
+  explicit HostRaised(const std::string& what) : std::runtime_error(what) {}
 };
 
 class FaultPlan {
@@ -82,12 +93,15 @@ class FaultPlan {
   void Restore(Proc proc);
   // Makes calls failAt, failAt + 1, ... (failTimes of them; all when negative) fail.
   void FailAt(Proc proc, int32_t failAt, int32_t failTimes = 1, int32_t error = -108);
+  // Makes call `raiseAt` throw HostRaised out of the procedure.
+  void RaiseAt(Proc proc, int32_t raiseAt);
 
   void SetTable(Table table, TableShape shape) { tables_[static_cast<size_t>(table)] = shape; }
   const TableShape& Shape(Table table) const { return tables_[static_cast<size_t>(table)]; }
 
   bool Removed(Proc proc) const { return Slot(proc).fault.removed; }
-  // Counts one call of `proc`; answers the error to fail it with, if it fails.
+  // Counts one call of `proc`; answers the error to fail it with, if it fails,
+  // or throws HostRaised when the failure is to raise.
   std::optional<int32_t> Count(Proc proc);
   int32_t Calls(Proc proc) const { return Slot(proc).calls; }
   void ResetCalls();

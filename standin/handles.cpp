@@ -10,6 +10,8 @@ Abi::Handle HandleRegistry::Create(std::vector<uint8_t> bytes, HandleOwner owner
   info->owner = owner;
   info->origin = std::move(origin);
   info->bytes = std::move(bytes);
+  // A handle of 0 bytes still locks to an address of its own.
+  if (info->bytes.capacity() == 0) info->bytes.reserve(1);
   // The handle is the address of its record: unique for the registry's life,
   // since records are kept after disposal.
   Abi::Handle handle = info.get();

@@ -122,11 +122,13 @@ int16_t Host::Call(int16_t selector) {
 int16_t Host::CallWithRecord(int16_t selector, void* record) {
   int16_t result = kResultSentinel;
   dataSlot_ = kDataSlotSentinel;
-  {
+  std::string name = "selector " + std::to_string(selector);
+  try {
     CurrentHost current(this);
     module_.Call(selector, record, &dataSlot_, &result);
+  } catch (...) {
+    Note("an exception left the entry point at " + name);
   }
-  std::string name = "selector " + std::to_string(selector);
   if (result == kResultSentinel) Note(name + " left the result word unwritten");
   if (dataSlot_ != kDataSlotSentinel) Note(name + " wrote into the data slot");
   CheckOutputUnchanged();

@@ -102,11 +102,14 @@ class Host {
   PropertyStore& Properties() { return properties_; }
   SuiteRegistry& Suites() { return suites_; }
   ProblemLog& Problems() { return problems_; }
+  const ProblemLog& Problems() const { return problems_; }
 
   BufferLayout inputLayout;
   BufferLayout outputLayout;
   int64_t deliveryLimit = int64_t{3} << 29;  // bytes per delivered buffer
-  std::function<void(Delivery&)> deliveryHook;
+  // Runs after the buffers are made and before they are written into the
+  // record; it may also change other fields of the record.
+  std::function<void(Delivery&, ByteBlock& record)> deliveryHook;
   uint32_t suiteBufferSpace = 1u << 30;  // what the buffer suite can hand out in all
 
   // The abort test answers "cancel" at its call number `call` (counted from now)

@@ -1,8 +1,8 @@
 // What each host procedure does. Every procedure is a plain function the module
 // calls with no context: it finds the host of the call in progress, counts the
 // call (which may fail it, by the fault plan), and never lets an exception
-// escape into the module. A call arriving when no host is calling the module is
-// answered with the procedure's neutral value.
+// escape into the module unless the plan says so. A call arriving when no host is calling the
+// module is answered with the procedure's neutral value.
 #include "standin/host_procs.h"
 
 #include <algorithm>
@@ -34,13 +34,16 @@ void* ToAddress(Function function) {
 class ProcImpl {
  public:
   // Runs `body` for the current host, or answers `neutral` without one or when
-  // the body throws (noted as a problem of the host's own).
+  // the body throws (noted as a problem of the host's own). Only a raise the
+  // fault plan asked for leaves a procedure.
   template <typename Result, typename Body>
-  static Result Guard(Proc proc, Result neutral, Body body) noexcept {
+  static Result Guard(Proc proc, Result neutral, Body body) {
     Host* host = Host::Current();
     if (host == nullptr) return neutral;
     try {
       return body(*host);
+    } catch (const HostRaised&) {
+      throw;
     } catch (const std::exception& error) {
       host->Note(std::string("the host failed inside ") + ProcName(proc) + ": " + error.what());
     } catch (...) {
@@ -49,7 +52,7 @@ class ProcImpl {
     return neutral;
   }
   template <typename Body>
-  static void GuardVoid(Proc proc, Body body) noexcept {
+  static void GuardVoid(Proc proc, Body body) {
     Guard(proc, 0, [&](Host& host) {
       body(host);
       return 0;
@@ -84,9 +87,8 @@ class ProcImpl {
         host.Note("new handle of negative size " + std::to_string(size));
         return nullptr;
       }
-      std::vector<uint8_t> bytes(static_cast<size_t>(size));
-      bytes.reserve(1);  // a handle of 0 bytes still locks to a non-null address
-      return host.handles_.Create(std::move(bytes), HandleOwner::Module, "new handle");
+      return host.handles_.Create(std::vector<uint8_t>(static_cast<size_t>(size)),
+                                  HandleOwner::Module, "new handle");
     });
   }
   static void DisposeHandle(Abi::Handle handle) { Dispose(Proc::HandleDispose, handle); }
@@ -530,7 +532,7 @@ class ProcImpl {
       delivery.outColumnBytes = host.output_->ColumnBytes();
     }
     delivery.result = result;
-    if (host.deliveryHook) host.deliveryHook(delivery);
+    if (host.deliveryHook) host.deliveryHook(delivery, record);
     record.PutPointer(F::kInData, delivery.inData);
     record.Put<int32_t>(F::kInRowBytes, delivery.inRowBytes);
     record.Put<int32_t>(F::kInColumnBytes, delivery.inColumnBytes);

@@ -1,8 +1,6 @@
 // The framework's process object and its event queue.
 #include "core/process.h"
 
-#include "core/exception.h"
-
 namespace Vireo {
 namespace {
 CProcess* g_currentProcess = nullptr;
@@ -38,9 +36,9 @@ void CProcess::HandlePendingEvents() {
   for (auto& event : pending) {
     try {
       HandleEvent(*event);
-    } catch (const CException&) {
+    } catch (...) {
       // The thread that posted the event is no longer waiting for it; there
-      // is nobody to hand the failure to.
+      // is nobody to hand the failure to, and the destructor runs this too.
     }
   }
 }

@@ -246,4 +246,35 @@ TEST_F(FilterRunTest, AFlatPageKeepsThePreviousAngle) {
   EXPECT_EQ(host_.descriptor.at(1).integerValue, 0);
 }
 
+int16_t DeliverNothing() {
+  return 0;
+}
+
+TEST_F(FilterRunTest, AFrameDeliveredWithoutBuffersGetsTheFailureRecord) {
+  LoadPage(PhotoPage(120, 90, 0.0));
+  host_.record.advanceState = &DeliverNothing;  // success, but no buffers
+  EXPECT_EQ(Run(), kAllSucceed);
+  EXPECT_EQ(RecordValues(), (std::vector<int16_t>{0, 0, 0, 119, 89, 119, 89, 0, 0}));
+  EXPECT_TRUE(alerts_.Lines().empty());
+}
+
+TEST_F(FilterRunTest, AHostOfferingNothingButTheDocumentGetsClearAnswers) {
+  host_.SetDocument(100, 100, 1, 1);
+  Vireo::FilterRecord bare{};
+  bare.documentSize = host_.record.documentSize;
+  bare.planes = 1;
+  bare.imageMode = 1;
+  bare.filterRect = host_.record.filterRect;
+  std::vector<int16_t> results;
+  for (int16_t selector = 1; selector <= 5; ++selector) {
+    int16_t result = 77;
+    ENTRYPOINT1(selector, &bare, nullptr, &result);
+    results.push_back(result);
+  }
+  // No frame could be delivered: the run is a failure the user need not see.
+  EXPECT_EQ(results, (std::vector<int16_t>{0, 0, 0, 1, 0}));
+  EXPECT_EQ(Vireo::CRastrixFilter::Current(), nullptr);
+  EXPECT_TRUE(alerts_.Lines().empty());
+}
+
 }  // namespace

@@ -36,6 +36,10 @@ void ExpectSameAnswer(const nlohmann::json& line, const Standin::Detection& d) {
   }
 }
 
+std::string LayoutCaseName(const ::testing::TestParamInfo<Layout>& p) {
+  return LayoutName(p.param);
+}
+
 class AgreementTest : public CliTest, public ::testing::WithParamInterface<Layout> {};
 
 TEST_P(AgreementTest, ProgramAndHostGiveTheSameAnswerForTheSameFrame) {
@@ -78,7 +82,7 @@ INSTANTIATE_TEST_SUITE_P(Layouts, AgreementTest,
                          ::testing::Values(Layout::Rgb, Layout::Gray, Layout::Rgb16, Layout::Gray16,
                                            Layout::RgbAlpha, Layout::GrayAlpha, Layout::Palette,
                                            Layout::Cmyk),
-                         [](const auto& info) { return std::string(LayoutName(info.param)); });
+                         LayoutCaseName);
 
 TEST_F(AgreementTest, PagesWithoutAPhotoReportTheModulesWholePageRecord) {
   auto module = Standin::Module::Load(FringeModule(), true);

@@ -88,10 +88,7 @@ TEST_F(BatchTest, ParallelAndSequentialRunsGiveIdenticalResults) {
   for (const auto& e : std::filesystem::recursive_directory_iterator(tmp_ / "out1")) {
     if (!e.is_regular_file()) continue;
     const auto rel = std::filesystem::relative(e.path(), tmp_ / "out1");
-    std::ifstream fa(e.path(), std::ios::binary), fb(tmp_ / "out2" / rel, std::ios::binary);
-    const std::string da(std::istreambuf_iterator<char>(fa), {});
-    const std::string db(std::istreambuf_iterator<char>(fb), {});
-    EXPECT_EQ(da, db) << rel;
+    EXPECT_EQ(ReadFile(e.path()), ReadFile(tmp_ / "out2" / rel)) << rel;
   }
 }
 
@@ -186,6 +183,41 @@ TEST_F(BatchTest, AKilledBatchLosesNothingItReported) {
   // No half-written files are left in the output folder.
   for (const auto& e : std::filesystem::recursive_directory_iterator(tmp_ / "out")) {
     EXPECT_NE(e.path().filename().string()[0], '.') << e.path();
+  }
+}
+
+}  // namespace
+}  // namespace FringeTest
+
+namespace FringeTest {
+namespace {
+
+TEST(WorkerIsolation, AModuleThatCrashesCostsOnlyThatPage) {
+  TempFolder tmp;
+  std::vector<std::string> args = {"detect", "--json", "--module", CrashingModule()};
+  for (int width : {100, 101, 102, 103, 104}) {
+    const std::string path = tmp / (std::string("w") + std::to_string(width) + ".png");
+    vips::VImage::black(width, 50).pngsave(path.c_str());
+    args.push_back(path);
+  }
+  for (const char* jobs : {"1", "2"}) {
+    SCOPED_TRACE(jobs);
+    std::vector<std::string> withJobs = args;
+    withJobs.insert(withJobs.begin() + 1, {"-j", jobs});
+    const RunOutcome r = RunFringe(withJobs);
+    EXPECT_EQ(r.exitCode, 70) << r.err;
+    const auto lines = r.JsonLines();
+    ASSERT_EQ(lines.size(), 5u) << r.out << r.err;
+    for (size_t i = 0; i < lines.size(); ++i) {
+      EXPECT_EQ(lines[i]["status"], "error");
+      EXPECT_EQ(lines[i]["error_kind"], "internal");
+      const std::string error = lines[i]["error"];
+      if (i % 2 == 1) {
+        EXPECT_NE(error.find("worker process killed by signal 6"), std::string::npos) << error;
+      } else {
+        EXPECT_NE(error.find("no 'fRNG' record"), std::string::npos) << error;
+      }
+    }
   }
 }
 

@@ -139,10 +139,12 @@ int RunBatch(const Options& o) {
       // Loaded here even for parallel runs: a module that cannot be loaded
       // is one clear error rather than one per page.
       PhotoDetector detector(modulePath);
-      if (jobs == 1 || tasks.size() == 1) {
+      if (tasks.size() == 1) {
         PageProcessor processor(detector, o.page);
-        for (size_t k = 0; k < tasks.size(); ++k) done(k, processor.Process(tasks[k]));
+        done(0, processor.Process(tasks[0]));
       } else {
+        // Batches run in worker processes even one at a time, so that a page
+        // that brings the module down costs only that page.
         WorkerPool(jobs, modulePath, o.page).Run(tasks, done);
       }
     } catch (const PageError& e) {

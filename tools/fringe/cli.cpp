@@ -56,31 +56,38 @@ Examples:
   fringe crop --json -j 4 --results done.jsonl scans/ -o photos)";
 
 void AddCommon(CLI::App* sub, Options& o) {
-  sub->add_option("inputs", o.inputs, "Image files or folders")->required();
+  sub->add_option("inputs", o.inputs, "Image files or folders")->required()->type_name("FILE|DIR");
   sub->add_flag("--json", o.json, "Print one JSON object per page (JSON Lines)");
   sub->add_option("-j,--jobs", o.jobs, "Pages processed in parallel (default: one per core)")
-      ->check(CLI::Range(1, 1024));
+      ->check(CLI::Range(1, 1024))
+      ->type_name("N");
   sub->add_option("--results", o.resultsFile,
                   "Append each page's JSON result to FILE; pages already in it are skipped, "
-                  "so an interrupted batch resumes where it stopped");
+                  "so an interrupted batch resumes where it stopped")
+      ->type_name("FILE");
   sub->add_flag("-q,--quiet", o.quiet, "No progress or summary on standard error");
-  sub->add_option("--module", o.modulePath, "The module file (default: Fringe.9zf next to fringe)");
+  sub->add_option("--module", o.modulePath, "The module file (default: Fringe.9zf next to fringe)")
+      ->type_name("FILE");
   sub->add_option("--max-side", o.page.maxSide,
                   "Detect on a copy no larger than N pixels a side; corners are scaled back. "
                   "Needed for pages above 32767 pixels a side")
-      ->check(CLI::Range(27, kModuleMaxSide));
+      ->check(CLI::Range(27, kModuleMaxSide))
+      ->type_name("N");
   sub->add_option("--max-pixels", o.page.maxPixels,
                   "Refuse files whose header promises more pixels than this")
       ->capture_default_str()
-      ->check(CLI::Range(uint64_t{1}, uint64_t{1} << 40));
+      ->check(CLI::Range(uint64_t{1}, uint64_t{1} << 40))
+      ->type_name("N");
 }
 
 void AddWriting(CLI::App* sub, Options& o, bool outline, bool photo) {
-  sub->add_option("-o,--output", o.page.outputDir, "Folder for the written files")->required();
+  sub->add_option("-o,--output", o.page.outputDir, "Folder for the written files")
+      ->required()
+      ->type_name("DIR");
   if (outline) {
-    sub->add_option("--outline-format", o.page.outlineFormat, "png or jpg")
+    sub->add_option("--outline-format", o.page.outlineFormat, "jpg or png")
         ->capture_default_str()
-        ->check(CLI::IsMember({"png", "jpg"}));
+        ->check(CLI::IsMember({"jpg", "png"}));
   }
   if (photo) {
     sub->add_option("--format", o.page.photoFormat,

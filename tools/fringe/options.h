@@ -19,7 +19,7 @@ struct OutputRequest {
 struct PageSettings {
   OutputRequest outputs;
   std::string outputDir;              // required when any output is requested
-  std::string outlineFormat = "png";  // png or jpg
+  std::string outlineFormat = "jpg";  // jpg or png
   std::string photoFormat;            // empty: the input's own format where it can be written
   int quality = 92;                   // JPEG and WebP quality of written files
   int margin = 0;                     // pixels added around the photo on every side of the crop

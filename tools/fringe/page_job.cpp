@@ -30,18 +30,17 @@ PageProcessor::PageProcessor(PhotoDetector& detector, const PageSettings& settin
 }
 
 void PageProcessor::WriteOutputs(const PageTask& task, const DecodedPage& page,
-                                 PageResult& result) {
+                                 const PhotoOutline& outline, PageResult& result) {
   if (!out_ || !result.answer.found) return;
   if (settings_.outputs.outline) {
     result.outlinePath =
         SaveImage(*out_, task.outStem + ".outline." + settings_.outlineFormat,
-                  OutlinePicture(page, result.answer), settings_.outlineFormat, settings_.quality);
+                  OutlinePicture(page, outline), settings_.outlineFormat, settings_.quality);
   }
   if (settings_.outputs.photo) {
     const std::string ext =
         settings_.photoFormat.empty() ? PhotoExtensionFor(page.format) : settings_.photoFormat;
-    const PhotoFrame frame =
-        FrameOfPhoto(result.answer.corners, result.answer.angle, settings_.margin);
+    const PhotoFrame frame = FrameOfPhoto(outline.corners, outline.angle, settings_.margin);
     result.photoPath = SaveImage(*out_, task.outStem + ".photo." + ext,
                                  StraightenedPhoto(page, frame), ext, settings_.quality);
   }
@@ -66,8 +65,11 @@ PageResult PageProcessor::Process(const PageTask& task) {
     result.times.detectMs = MsSince(start);
     result.status = result.answer.found ? PageStatus::Found : PageStatus::NotFound;
 
+    // The outputs follow the module's own outline.
+    const PhotoOutline outline = OutlineOf(result.answer);
+
     start = Clock::now();
-    WriteOutputs(task, page, result);
+    WriteOutputs(task, page, outline, result);
     result.times.writeMs = MsSince(start);
     return result;
   } catch (const PageError& e) {

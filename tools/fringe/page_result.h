@@ -28,6 +28,17 @@ struct ModuleAnswer {
   bool operator==(const ModuleAnswer&) const = default;
 };
 
+// The outline that drawing and cropping follow: the module's answer as it
+// stands, or a refined one when a step between detection and output supplies it.
+struct PhotoOutline {
+  std::array<Corner, 4> corners{};  // top-left, top-right, bottom-right, bottom-left
+  double angle = 0.0;               // degrees
+};
+
+inline PhotoOutline OutlineOf(const ModuleAnswer& answer) {
+  return {answer.corners, answer.angle};
+}
+
 struct PageTimes {
   double decodeMs = 0.0;
   double detectMs = 0.0;

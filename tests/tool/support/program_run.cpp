@@ -20,7 +20,7 @@ namespace FringeTest {
 
 namespace {
 
-std::string ReadAll(const std::string& path) {
+std::string ReadAllOf(const std::string& path) {
   std::ifstream in(path, std::ios::binary);
   std::stringstream s;
   s << in.rdbuf();
@@ -29,11 +29,18 @@ std::string ReadAll(const std::string& path) {
 
 }  // namespace
 
+std::string ReadFile(const std::string& path) {
+  return ReadAllOf(path);
+}
+
 std::string FringeProgram() {
   return FRINGE_TEST_PROGRAM;
 }
 std::string FringeModule() {
   return FRINGE_TEST_MODULE;
+}
+std::string CrashingModule() {
+  return FRINGE_TEST_CRASHING_MODULE;
 }
 
 std::vector<nlohmann::json> RunOutcome::JsonLines() const {
@@ -97,8 +104,8 @@ RunOutcome RunFringe(const std::vector<std::string>& args, const std::string& cw
   if (WIFEXITED(status)) r.exitCode = WEXITSTATUS(status);
   if (WIFSIGNALED(status)) r.signal = WTERMSIG(status);
   r.peakKilobytes = usage.ru_maxrss;
-  r.out = ReadAll(outPath);
-  r.err = ReadAll(errPath);
+  r.out = ReadFile(outPath);
+  r.err = ReadFile(errPath);
   return r;
 }
 

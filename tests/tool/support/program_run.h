@@ -20,9 +20,14 @@ struct RunOutcome {
   std::vector<nlohmann::json> JsonLines() const;
 };
 
+// The whole content of a file; empty when it cannot be read.
+std::string ReadFile(const std::string& path);
+
 // The fringe program and module under test (set by the build).
 std::string FringeProgram();
 std::string FringeModule();
+// A module file that aborts on pages of odd width and publishes nothing on others.
+std::string CrashingModule();
 
 // Runs fringe with args in folder cwd (empty: the current one).
 RunOutcome RunFringe(const std::vector<std::string>& args, const std::string& cwd = "");
