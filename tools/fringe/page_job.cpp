@@ -7,6 +7,7 @@
 #include "image_saver.h"
 #include "outline_picture.h"
 #include "photo_geometry.h"
+#include "refine_step.h"
 #include "straightened_photo.h"
 #include "vips_text.h"
 
@@ -31,7 +32,7 @@ PageProcessor::PageProcessor(PhotoDetector& detector, const PageSettings& settin
 
 void PageProcessor::WriteOutputs(const PageTask& task, const DecodedPage& page,
                                  const PhotoOutline& outline, PageResult& result) {
-  if (!out_ || !result.answer.found) return;
+  if (!out_ || result.status != PageStatus::Found) return;
   if (settings_.outputs.outline) {
     result.outlinePath =
         SaveImage(*out_, task.outStem + ".outline." + settings_.outlineFormat,
@@ -65,8 +66,13 @@ PageResult PageProcessor::Process(const PageTask& task) {
     result.times.detectMs = MsSince(start);
     result.status = result.answer.found ? PageStatus::Found : PageStatus::NotFound;
 
-    // The outputs follow the module's own outline.
-    const PhotoOutline outline = OutlineOf(result.answer);
+    // The outputs follow the refined outline unless the module's own is asked for.
+    PhotoOutline outline = OutlineOf(result.answer);
+    if (settings_.refine) {
+      result.refined = RefineOnPage(detector_, page, result.answer);
+      result.status = result.refined.found ? PageStatus::Found : PageStatus::NotFound;
+      if (result.refined.found) outline = OutlineFromRefined(result.refined, settings_.pictureEdge);
+    }
 
     start = Clock::now();
     WriteOutputs(task, page, outline, result);

@@ -7,6 +7,7 @@
 #include <string>
 
 #include "page_error.h"
+#include "refined_answer.h"
 
 namespace Fringe {
 
@@ -54,10 +55,11 @@ struct PageResult {
   std::string error;  // why the page failed; empty otherwise
   int32_t width = 0;
   int32_t height = 0;
-  bool gray = false;   // detected as a grayscale document rather than RGB
-  bool alpha = false;  // the alpha channel went to the module as transparency
-  std::string format;  // the loader that read the file, e.g. "jpeg"
-  ModuleAnswer answer;
+  bool gray = false;        // detected as a grayscale document rather than RGB
+  bool alpha = false;       // the alpha channel went to the module as transparency
+  std::string format;       // the loader that read the file, e.g. "jpeg"
+  ModuleAnswer answer;      // exactly as the module published it
+  RefinedAnswer refined;    // the outline found again in the page, unless --raw
   std::string outlinePath;  // written outline picture, empty if none
   std::string photoPath;    // written straightened photo, empty if none
   PageTimes times;

@@ -29,11 +29,19 @@ int Rank(const Refinement& r) {
 
 PipelineResult DetectAndRefine(Detector& detector, const PageImage& page,
                                const PipelineOptions& options) {
-  PipelineResult result;
-  auto start = std::chrono::steady_clock::now();
-  result.raw = detector.Detect(page, std::nullopt);
-  result.detectSeconds = Since(start);
+  const auto start = std::chrono::steady_clock::now();
+  const ModuleAnswer raw = detector.Detect(page, std::nullopt);
+  const double seconds = Since(start);
+  PipelineResult result = RefineDetection(detector, page, raw, options);
+  result.detectSeconds += seconds;
+  return result;
+}
 
+PipelineResult RefineDetection(Detector& detector, const PageImage& page, const ModuleAnswer& raw,
+                               const PipelineOptions& options) {
+  PipelineResult result;
+  result.raw = raw;
+  auto start = std::chrono::steady_clock::now();
   ModuleAnswer chosen = result.raw;
   RefineOptions refineOptions = options.refinement;
   if (options.prepare) {
@@ -65,7 +73,7 @@ PipelineResult DetectAndRefine(Detector& detector, const PageImage& page,
     result.refined = RefineOutline(page, chosen, refineOptions);
     // The module's first answer may still serve better than the prepared one.
     if (result.prepared && result.raw.FoundPhoto() && Rank(result.refined) < 2) {
-      Refinement other = RefineOutline(page, result.raw, options.refinement);
+      Refinement other = RefineOutline(page, result.raw, refineOptions);
       if (Rank(other) > Rank(result.refined)) result.refined = std::move(other);
     }
   }

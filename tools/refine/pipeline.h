@@ -33,4 +33,8 @@ struct PipelineResult {
 PipelineResult DetectAndRefine(Detector& detector, const PageImage& page,
                                const PipelineOptions& options = {});
 
+// The same, when the module has already given its answer on the page as it is.
+PipelineResult RefineDetection(Detector& detector, const PageImage& page, const ModuleAnswer& raw,
+                               const PipelineOptions& options = {});
+
 }  // namespace Refine

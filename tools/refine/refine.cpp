@@ -106,7 +106,7 @@ void PlaceSide(const GraySampler& sampler, const SampleArea& area, SideWork& wor
   request.smear = SmearFor(reading.noise);
   const double lineNoise = reading.noise / std::sqrt(static_cast<double>(request.smear));
   request.minGradient = std::max({2.0, 3.0 * lineNoise, 0.25 * reading.gradient});
-  const int fineLines = std::clamp(static_cast<int>(length / 5.0), 20, 160);
+  const int fineLines = std::clamp(static_cast<int>(length / 6.0), 20, 128);
   const auto tFine = SpreadPositions(work.trim, length - work.trim, fineLines);
   const auto samples = LocateEdges(sampler, area, frame, tFine, request);
   const LineFitResult fit = FitLineRobust(samples);
@@ -164,7 +164,7 @@ std::optional<Line> FindInnerEdge(const GraySampler& sampler, const SampleArea& 
   request.smear = SmearFor(r.noise);
   request.minGradient =
       std::max(2.0, 3.0 * r.noise / std::sqrt(static_cast<double>(request.smear)));
-  const int lines = std::clamp(static_cast<int>(work.frame.length / 5.0), 20, 160);
+  const int lines = std::clamp(static_cast<int>(work.frame.length / 6.0), 20, 128);
   const auto t = SpreadPositions(work.trim, work.frame.length - work.trim, lines);
   const LineFitResult fit = FitLineRobust(LocateEdges(sampler, area, work.frame, t, request));
   if (!fit.ok || static_cast<double>(fit.inliers) / lines < 0.3 || fit.rms > 1.5)
@@ -351,7 +351,8 @@ Refinement RefineOutline(const PageImage& page, const ModuleAnswer& answer,
       // A pale calm stretch inside the paper's edge that runs past the first
       // band: look deeper in for where the picture begins.
       const double deeper = std::max(reachIn, maxMargin + 12.0 - w.reading.offset);
-      AlignedProfile deep = MeasureSide(sampler, area, w, -deeper, reach);
+      AlignedProfile deep =
+          MeasureSide(sampler, area, w, -deeper, std::min(reach, w.reading.offset + 48.0));
       SideReading again = ReadSide(deep, readOptions);
       if (again.found && again.margin && std::abs(again.offset - w.reading.offset) <= 1.5) {
         w.profile = std::move(deep);
