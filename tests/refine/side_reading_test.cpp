@@ -147,6 +147,9 @@ TEST(SideReading, PaperRunningOffThePage) {
   for (size_t k = 0; k < p.mean.size(); ++k) {
     if (p.OffsetOf(static_cast<double>(k)) > 20.0) p.mean[k] = p.roughness[k] = kNaN;
   }
+  // Values missing only because lines were lined up: the page goes on.
+  EXPECT_FALSE(ReadSide(p, {}).pageEdge);
+  p.areaEnds = true;
   const SideReading r = ReadSide(p, {});
   ASSERT_TRUE(r.found);
   EXPECT_TRUE(r.pageEdge);
@@ -160,6 +163,7 @@ TEST(SideReading, BareLidHasNoEdge) {
   for (size_t k = 0; k < p.mean.size(); ++k) {
     if (p.OffsetOf(static_cast<double>(k)) > 20.0) p.mean[k] = p.roughness[k] = kNaN;
   }
+  p.areaEnds = true;
   const SideReading r = ReadSide(p, {});
   EXPECT_FALSE(r.found);
   EXPECT_FALSE(r.pageEdge);

@@ -71,6 +71,8 @@ AlignedProfile AlignProfiles(const ProfileStrip& strip, double maxSlope) {
   out.roughness.assign(static_cast<size_t>(width), kNaN);
   if (strip.lines < 2 || width < 3) return out;
   out.tCentre = 0.5 * (strip.t.front() + strip.t.back());
+  for (int line = 0; line < strip.lines && !out.areaEnds; ++line)
+    out.areaEnds = std::isnan(strip.At(line, width - 1));
 
   // Groups of neighbouring lines, short enough that a small slope does not
   // blur them: their means, and later their roughness.
@@ -172,7 +174,9 @@ AlignedProfile AlignProfiles(const ProfileStrip& strip, double maxSlope) {
       const double r = groupRough[static_cast<size_t>(g)][static_cast<size_t>(k)];
       if (!std::isnan(r)) roughs.push_back(r);
     }
-    if (values.empty() || 2 * static_cast<int>(values.size()) < groupCount) continue;
+    // Every group or none: where some lines have run off the page the median
+    // of the rest would step for no reason on the page.
+    if (static_cast<int>(values.size()) < groupCount) continue;
     out.mean[static_cast<size_t>(k)] = MedianOf(values);
     if (!roughs.empty()) out.roughness[static_cast<size_t>(k)] = MedianOf(roughs);
   }

@@ -16,8 +16,9 @@ struct AlignedProfile {
   double sStep = 1.0;
   std::vector<double> mean;  // median over the lines; NaN where too few reach
   std::vector<double>
-      roughness;       // median |difference| between neighbouring lines, as a noise sigma
-  double noise = 0.0;  // calmest roughness: the noise of one value, gray levels
+      roughness;          // median |difference| between neighbouring lines, as a noise sigma
+  double noise = 0.0;     // calmest roughness: the noise of one value, gray levels
+  bool areaEnds = false;  // some lines ran out of the sampled area (the page's edge)
   int lines = 0;
 
   int Size() const { return static_cast<int>(mean.size()); }

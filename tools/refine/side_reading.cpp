@@ -325,7 +325,7 @@ class Reader {
         break;
       }
     }
-    if (last < 0 || last >= n - 1) return r;  // the profile was not cut short
+    if (last < 0 || !p_.areaEnds) return r;  // the profile was not cut short by the page
     // Paper running off the page keeps its texture or its step from the lid
     // right up to where the page ends; the bare lid does not.
     const double level = mean_.Mean(last - 10.0, last);
