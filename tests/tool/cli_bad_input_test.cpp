@@ -14,11 +14,6 @@ void WriteBytes(const std::string& path, const std::string& bytes) {
   std::ofstream(path, std::ios::binary) << bytes;
 }
 
-std::string ReadBytes(const std::string& path) {
-  std::ifstream in(path, std::ios::binary);
-  return std::string(std::istreambuf_iterator<char>(in), {});
-}
-
 std::string BigEndian(uint32_t v) {
   return {static_cast<char>(v >> 24), static_cast<char>(v >> 16), static_cast<char>(v >> 8),
           static_cast<char>(v)};
@@ -83,7 +78,7 @@ TEST_F(BadInputTest, TruncatedFilesOfEachFormat) {
   for (const char* ext : {"png", "jpg", "tif", "webp"}) {
     SCOPED_TRACE(ext);
     const std::string whole = WritePageFile(std::string("whole.") + ext);
-    const std::string bytes = ReadBytes(whole);
+    const std::string bytes = ReadFile(whole);
     const std::string cut = tmp_ / (std::string("cut.") + ext);
     WriteBytes(cut, bytes.substr(0, bytes.size() / 2));
     const std::string why = ExpectRefused(cut);

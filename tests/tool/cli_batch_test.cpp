@@ -88,10 +88,7 @@ TEST_F(BatchTest, ParallelAndSequentialRunsGiveIdenticalResults) {
   for (const auto& e : std::filesystem::recursive_directory_iterator(tmp_ / "out1")) {
     if (!e.is_regular_file()) continue;
     const auto rel = std::filesystem::relative(e.path(), tmp_ / "out1");
-    std::ifstream fa(e.path(), std::ios::binary), fb(tmp_ / "out2" / rel, std::ios::binary);
-    const std::string da(std::istreambuf_iterator<char>(fa), {});
-    const std::string db(std::istreambuf_iterator<char>(fb), {});
-    EXPECT_EQ(da, db) << rel;
+    EXPECT_EQ(ReadFile(e.path()), ReadFile(tmp_ / "out2" / rel)) << rel;
   }
 }
 
@@ -199,7 +196,7 @@ TEST(WorkerIsolation, AModuleThatCrashesCostsOnlyThatPage) {
   TempFolder tmp;
   std::vector<std::string> args = {"detect", "--json", "--module", CrashingModule()};
   for (int width : {100, 101, 102, 103, 104}) {
-    const std::string path = tmp / ("w" + std::to_string(width) + ".png");
+    const std::string path = tmp / (std::string("w") + std::to_string(width) + ".png");
     vips::VImage::black(width, 50).pngsave(path.c_str());
     args.push_back(path);
   }

@@ -52,7 +52,7 @@ TEST_F(OutputsTest, OutlinePictureMarksTheCorners) {
   const std::string page = WritePageFile("page.jpg", Layout::Gray, 10.0);
   // PNG keeps the marks' colours exact.
   const RunOutcome r =
-      Fringe({"draw", "--json", "--outline-format", "png", page, "-o", tmp_ / "out"});
+      Fringe({"draw", "--raw", "--json", "--outline-format", "png", page, "-o", tmp_ / "out"});
   ASSERT_EQ(r.exitCode, 0) << r.err;
   const nlohmann::json line = OnlyLine(r);
   EXPECT_FALSE(line.contains("photo"));

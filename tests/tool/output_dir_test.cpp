@@ -7,6 +7,7 @@
 
 #include "output_dir.h"
 #include "page_error.h"
+#include "program_run.h"
 #include "temp_folder.h"
 
 namespace Fringe {
@@ -19,8 +20,7 @@ void WriteText(int fd, const std::string& text) {
 }
 
 std::string Slurp(const fs::path& p) {
-  std::ifstream in(p);
-  return std::string(std::istreambuf_iterator<char>(in), {});
+  return FringeTest::ReadFile(p.string());
 }
 
 TEST(OutputDir, RelativePathsThatWouldLeaveAreRefused) {

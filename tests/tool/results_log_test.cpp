@@ -4,6 +4,7 @@
 #include <fstream>
 
 #include "page_error.h"
+#include "program_run.h"
 #include "result_json.h"
 #include "results_log.h"
 #include "temp_folder.h"
@@ -26,8 +27,7 @@ PageResult Found(const std::string& file) {
 }
 
 std::string ReadAll(const std::string& path) {
-  std::ifstream in(path);
-  return std::string(std::istreambuf_iterator<char>(in), {});
+  return FringeTest::ReadFile(path);
 }
 
 TEST(ResultsLog, ReadsBackEveryRecordedPage) {

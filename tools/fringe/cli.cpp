@@ -32,13 +32,28 @@ Inputs:
   (hidden names skipped, each folder once however links loop). Gray pages run as grayscale
   documents, everything else as RGB; alpha becomes the document's transparency.
 
+Refinement:
+  After the module has answered, fringe finds every side of the photo again in the page:
+  edge positions along each side, a straight line fitted to each, corners where the lines
+  meet. It puts the edge on the paper rather than on the lid's shadow, finds a white paper
+  margin and the picture inside it, and where the page made the module fail (a dark strip of
+  the scanner bed along an edge, heavy noise, a dark or uneven lid) runs the module again on
+  a prepared page. Drawing and cropping follow the refined outline; --raw gives the module's
+  answer everywhere. Refined corners are where the paper's edges meet, with pixel centres at
+  whole numbers (an edge between two pixels lies at .5).
+
 Output:
   One line per page on standard output, in the order the pages were named; --json gives
   JSON Lines: {"file", "status": "found"|"not_found"|"error", "width", "height",
   "mode": "gray"|"rgb", "alpha", "format", "confidence", "angle", "corners": [[x,y] x4],
-  "outline", "photo", "times_ms": {"decode","detect","write"}, "error", "error_kind"}.
-  The angle reads back to the exact double the module published; it is 0 when no photo
-  was found. Written files are <name>.outline.<ext> and <name>.photo.<ext> below --output,
+  "refined", "outline", "photo", "times_ms": {"decode","detect","write","prepare","refine"},
+  "error", "error_kind"}. "confidence", "angle" and "corners" are the module's answer exactly
+  as it published it; the angle reads back to the exact double, and is 0 when no photo was
+  found. "refined" holds {"status": "refined"|"partial"|"kept"|"no-photo", "reason", "found",
+  "corners": [[x,y] x4], "angle", "sides": [{"side", "status", "rms", "support", "contrast",
+  "band", "margin", "note"} x4], "margin", "picture", "preparations": [{"kind", "detail"}],
+  "prepared": {"confidence", "angle", "corners", "filter_rect"}}; "status" (found or not)
+  follows the refined answer unless --raw is given. Written files are <name>.outline.<ext> and <name>.photo.<ext> below --output,
   mirroring the input folders. Errors go to standard error, naming the file.
 
 Exit codes:
@@ -56,27 +71,38 @@ Examples:
   fringe crop --json -j 4 --results done.jsonl scans/ -o photos)";
 
 void AddCommon(CLI::App* sub, Options& o) {
-  sub->add_option("inputs", o.inputs, "Image files or folders")->required();
+  sub->add_option("inputs", o.inputs, "Image files or folders")->required()->type_name("FILE|DIR");
   sub->add_flag("--json", o.json, "Print one JSON object per page (JSON Lines)");
   sub->add_option("-j,--jobs", o.jobs, "Pages processed in parallel (default: one per core)")
-      ->check(CLI::Range(1, 1024));
+      ->check(CLI::Range(1, 1024))
+      ->type_name("N");
   sub->add_option("--results", o.resultsFile,
                   "Append each page's JSON result to FILE; pages already in it are skipped, "
-                  "so an interrupted batch resumes where it stopped");
+                  "so an interrupted batch resumes where it stopped")
+      ->type_name("FILE");
   sub->add_flag("-q,--quiet", o.quiet, "No progress or summary on standard error");
-  sub->add_option("--module", o.modulePath, "The module file (default: Fringe.9zf next to fringe)");
+  sub->add_option("--module", o.modulePath, "The module file (default: Fringe.9zf next to fringe)")
+      ->type_name("FILE");
   sub->add_option("--max-side", o.page.maxSide,
                   "Detect on a copy no larger than N pixels a side; corners are scaled back. "
                   "Needed for pages above 32767 pixels a side")
-      ->check(CLI::Range(27, kModuleMaxSide));
+      ->check(CLI::Range(27, kModuleMaxSide))
+      ->type_name("N");
+  sub->add_flag_callback(
+      "--raw", [&o] { o.page.refine = false; },
+      "Report, draw and crop the module's answer as it stands: no page preparation, no "
+      "refinement");
   sub->add_option("--max-pixels", o.page.maxPixels,
                   "Refuse files whose header promises more pixels than this")
       ->capture_default_str()
-      ->check(CLI::Range(uint64_t{1}, uint64_t{1} << 40));
+      ->check(CLI::Range(uint64_t{1}, uint64_t{1} << 40))
+      ->type_name("N");
 }
 
 void AddWriting(CLI::App* sub, Options& o, bool outline, bool photo) {
-  sub->add_option("-o,--output", o.page.outputDir, "Folder for the written files")->required();
+  sub->add_option("-o,--output", o.page.outputDir, "Folder for the written files")
+      ->required()
+      ->type_name("DIR");
   if (outline) {
     sub->add_option("--outline-format", o.page.outlineFormat, "jpg or png")
         ->capture_default_str()
@@ -91,6 +117,12 @@ void AddWriting(CLI::App* sub, Options& o, bool outline, bool photo) {
         ->capture_default_str()
         ->check(CLI::Range(0, 10000));
   }
+  sub->add_option_function<std::string>(
+         "--edge", [&o](const std::string& edge) { o.page.pictureEdge = edge == "inner"; },
+         "For prints with a white margin: outer (the paper's edge, default) or inner (the "
+         "picture inside the margin)")
+      ->check(CLI::IsMember({"outer", "inner"}))
+      ->type_name("outer|inner");
   sub->add_option("--quality", o.page.quality, "JPEG and WebP quality")
       ->capture_default_str()
       ->check(CLI::Range(1, 100));

@@ -25,6 +25,8 @@ struct PageSettings {
   int margin = 0;                     // pixels added around the photo on every side of the crop
   int32_t maxSide = 0;  // 0: refuse pages above the module's limit; else detect on a copy this size
   uint64_t maxPixels = 250000000;  // refuse files whose header promises more pixels
+  bool refine = true;              // prepare the page and refine the module's answer
+  bool pictureEdge = false;        // draw and crop the picture inside a white margin, not the paper
 };
 
 struct Options {

@@ -23,16 +23,16 @@ void DrawThickLine(const vips::VImage& mask, Corner a, Corner b, int thickness) 
 
 }  // namespace
 
-vips::VImage OutlinePicture(const DecodedPage& page, const ModuleAnswer& answer) {
+vips::VImage OutlinePicture(const DecodedPage& page, const PhotoOutline& outline) {
   const int thickness = std::max(2, static_cast<int>(std::min(page.width, page.height) / 300));
   vips::VImage mask = vips::VImage::black(page.width, page.height).copy_memory();
   for (int k = 0; k < 4; ++k) {
-    DrawThickLine(mask, answer.corners[k], answer.corners[(k + 1) % 4], thickness);
+    DrawThickLine(mask, outline.corners[k], outline.corners[(k + 1) % 4], thickness);
   }
   const int radius = 3 * thickness;
   for (int k = 3; k >= 0; --k) {
-    mask.draw_circle({k == 0 ? kFirstCornerInk : kOutlineInk}, answer.corners[k].x,
-                     answer.corners[k].y, radius, vips::VImage::option()->set("fill", true));
+    mask.draw_circle({k == 0 ? kFirstCornerInk : kOutlineInk}, outline.corners[k].x,
+                     outline.corners[k].y, radius, vips::VImage::option()->set("fill", true));
   }
 
   vips::VImage base = page.image;

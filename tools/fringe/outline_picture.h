@@ -12,6 +12,6 @@ namespace Fringe {
 // in red and a mark on every corner, the top-left one green so that the
 // photo's orientation shows. Only a one-byte mask is held in memory; the
 // picture itself is computed as it is written.
-vips::VImage OutlinePicture(const DecodedPage& page, const ModuleAnswer& answer);
+vips::VImage OutlinePicture(const DecodedPage& page, const PhotoOutline& outline);
 
 }  // namespace Fringe

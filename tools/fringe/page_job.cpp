@@ -7,6 +7,7 @@
 #include "image_saver.h"
 #include "outline_picture.h"
 #include "photo_geometry.h"
+#include "refine_step.h"
 #include "straightened_photo.h"
 #include "vips_text.h"
 
@@ -30,18 +31,17 @@ PageProcessor::PageProcessor(PhotoDetector& detector, const PageSettings& settin
 }
 
 void PageProcessor::WriteOutputs(const PageTask& task, const DecodedPage& page,
-                                 PageResult& result) {
-  if (!out_ || !result.answer.found) return;
+                                 const PhotoOutline& outline, PageResult& result) {
+  if (!out_ || result.status != PageStatus::Found) return;
   if (settings_.outputs.outline) {
     result.outlinePath =
         SaveImage(*out_, task.outStem + ".outline." + settings_.outlineFormat,
-                  OutlinePicture(page, result.answer), settings_.outlineFormat, settings_.quality);
+                  OutlinePicture(page, outline), settings_.outlineFormat, settings_.quality);
   }
   if (settings_.outputs.photo) {
     const std::string ext =
         settings_.photoFormat.empty() ? PhotoExtensionFor(page.format) : settings_.photoFormat;
-    const PhotoFrame frame =
-        FrameOfPhoto(result.answer.corners, result.answer.angle, settings_.margin);
+    const PhotoFrame frame = FrameOfPhoto(outline.corners, outline.angle, settings_.margin);
     result.photoPath = SaveImage(*out_, task.outStem + ".photo." + ext,
                                  StraightenedPhoto(page, frame), ext, settings_.quality);
   }
@@ -66,8 +66,16 @@ PageResult PageProcessor::Process(const PageTask& task) {
     result.times.detectMs = MsSince(start);
     result.status = result.answer.found ? PageStatus::Found : PageStatus::NotFound;
 
+    // The outputs follow the refined outline unless the module's own is asked for.
+    PhotoOutline outline = OutlineOf(result.answer);
+    if (settings_.refine) {
+      result.refined = RefineOnPage(detector_, page, result.answer);
+      result.status = result.refined.found ? PageStatus::Found : PageStatus::NotFound;
+      if (result.refined.found) outline = OutlineFromRefined(result.refined, settings_.pictureEdge);
+    }
+
     start = Clock::now();
-    WriteOutputs(task, page, result);
+    WriteOutputs(task, page, outline, result);
     result.times.writeMs = MsSince(start);
     return result;
   } catch (const PageError& e) {

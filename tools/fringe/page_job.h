@@ -28,7 +28,8 @@ class PageProcessor {
   PageResult Process(const PageTask& task);
 
  private:
-  void WriteOutputs(const PageTask& task, const DecodedPage& page, PageResult& result);
+  void WriteOutputs(const PageTask& task, const DecodedPage& page, const PhotoOutline& outline,
+                    PageResult& result);
 
   PhotoDetector& detector_;
   PageSettings settings_;

@@ -7,6 +7,7 @@
 #include <string>
 
 #include "page_error.h"
+#include "refined_answer.h"
 
 namespace Fringe {
 
@@ -28,6 +29,17 @@ struct ModuleAnswer {
   bool operator==(const ModuleAnswer&) const = default;
 };
 
+// The outline that drawing and cropping follow: the module's answer as it
+// stands, or a refined one when a step between detection and output supplies it.
+struct PhotoOutline {
+  std::array<Corner, 4> corners{};  // top-left, top-right, bottom-right, bottom-left
+  double angle = 0.0;               // degrees
+};
+
+inline PhotoOutline OutlineOf(const ModuleAnswer& answer) {
+  return {answer.corners, answer.angle};
+}
+
 struct PageTimes {
   double decodeMs = 0.0;
   double detectMs = 0.0;
@@ -43,10 +55,11 @@ struct PageResult {
   std::string error;  // why the page failed; empty otherwise
   int32_t width = 0;
   int32_t height = 0;
-  bool gray = false;   // detected as a grayscale document rather than RGB
-  bool alpha = false;  // the alpha channel went to the module as transparency
-  std::string format;  // the loader that read the file, e.g. "jpeg"
-  ModuleAnswer answer;
+  bool gray = false;        // detected as a grayscale document rather than RGB
+  bool alpha = false;       // the alpha channel went to the module as transparency
+  std::string format;       // the loader that read the file, e.g. "jpeg"
+  ModuleAnswer answer;      // exactly as the module published it
+  RefinedAnswer refined;    // the outline found again in the page, unless --raw
   std::string outlinePath;  // written outline picture, empty if none
   std::string photoPath;    // written straightened photo, empty if none
   PageTimes times;

@@ -85,6 +85,13 @@ ModuleAnswer PhotoDetector::Detect(const DecodedPage& page, int32_t maxSide) {
   return a;
 }
 
+ModuleAnswer PhotoDetector::DetectPixels(const Standin::PageView& view,
+                                         const std::optional<std::array<int32_t, 4>>& filterRect) {
+  Standin::DetectOptions options;
+  options.filterRect = filterRect;
+  return AnswerFrom(Standin::Detect(*module_, view, options));
+}
+
 std::string DefaultModulePath() {
   std::error_code ec;
   const auto self = std::filesystem::read_symlink("/proc/self/exe", ec);

@@ -58,8 +58,13 @@ nlohmann::ordered_json ToJson(const PageResult& r) {
     if (r.answer.detectScale != 1.0) j["detect_scale"] = r.answer.detectScale;
     if (!r.outlinePath.empty()) j["outline"] = r.outlinePath;
     if (!r.photoPath.empty()) j["photo"] = r.photoPath;
+    if (r.refined.present) j["refined"] = ToJson(r.refined);
     j["times_ms"] = {
         {"decode", r.times.decodeMs}, {"detect", r.times.detectMs}, {"write", r.times.writeMs}};
+    if (r.refined.present) {
+      j["times_ms"]["prepare"] = r.refined.prepareMs;
+      j["times_ms"]["refine"] = r.refined.refineMs;
+    }
   }
   return j;
 }
@@ -103,6 +108,11 @@ PageResult ResultFromJson(const nlohmann::json& j) {
     const auto& t = j.at("times_ms");
     r.times = {t.at("decode").get<double>(), t.at("detect").get<double>(),
                t.at("write").get<double>()};
+    if (j.contains("refined")) {
+      r.refined = RefinedFromJson(j.at("refined"));
+      r.refined.prepareMs = t.value("prepare", 0.0);
+      r.refined.refineMs = t.value("refine", 0.0);
+    }
   }
   return r;
 }
@@ -116,7 +126,9 @@ nlohmann::json ToJson(const PageSettings& s) {
           {"quality", s.quality},
           {"margin", s.margin},
           {"max_side", s.maxSide},
-          {"max_pixels", s.maxPixels}};
+          {"max_pixels", s.maxPixels},
+          {"refine", s.refine},
+          {"picture_edge", s.pictureEdge}};
 }
 
 PageSettings SettingsFromJson(const nlohmann::json& j) {
@@ -130,6 +142,8 @@ PageSettings SettingsFromJson(const nlohmann::json& j) {
   s.margin = j.at("margin").get<int>();
   s.maxSide = j.at("max_side").get<int32_t>();
   s.maxPixels = j.at("max_pixels").get<uint64_t>();
+  s.refine = j.value("refine", true);
+  s.pictureEdge = j.value("picture_edge", false);
   return s;
 }
 

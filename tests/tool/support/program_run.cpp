@@ -20,7 +20,7 @@ namespace FringeTest {
 
 namespace {
 
-std::string ReadAll(const std::string& path) {
+std::string ReadAllOf(const std::string& path) {
   std::ifstream in(path, std::ios::binary);
   std::stringstream s;
   s << in.rdbuf();
@@ -28,6 +28,10 @@ std::string ReadAll(const std::string& path) {
 }
 
 }  // namespace
+
+std::string ReadFile(const std::string& path) {
+  return ReadAllOf(path);
+}
 
 std::string FringeProgram() {
   return FRINGE_TEST_PROGRAM;
@@ -100,8 +104,8 @@ RunOutcome RunFringe(const std::vector<std::string>& args, const std::string& cw
   if (WIFEXITED(status)) r.exitCode = WEXITSTATUS(status);
   if (WIFSIGNALED(status)) r.signal = WTERMSIG(status);
   r.peakKilobytes = usage.ru_maxrss;
-  r.out = ReadAll(outPath);
-  r.err = ReadAll(errPath);
+  r.out = ReadFile(outPath);
+  r.err = ReadFile(errPath);
   return r;
 }
 

@@ -20,6 +20,9 @@ struct RunOutcome {
   std::vector<nlohmann::json> JsonLines() const;
 };
 
+// The whole content of a file; empty when it cannot be read.
+std::string ReadFile(const std::string& path);
+
 // The fringe program and module under test (set by the build).
 std::string FringeProgram();
 std::string FringeModule();
