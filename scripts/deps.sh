@@ -9,5 +9,5 @@ $SUDO apt-get install -y -qq --no-install-recommends \
   cmake ninja-build g++ make pkg-config git ca-certificates \
   googletest libgtest-dev libbenchmark-dev \
   g++-mingw-w64-x86-64-posix binutils-mingw-w64-x86-64 wine wine64 \
-  libvips-dev libcli11-dev nlohmann-json3-dev \
-  icoutils clang-format valgrind file >/dev/null
+  libvips-dev libcli11-dev nlohmann-json3-dev zlib1g-dev \
+  icoutils clang-format valgrind file procps >/dev/null

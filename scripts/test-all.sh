@@ -14,9 +14,12 @@ run_preset() {
 }
 
 run_preset release
+echo "== memcheck: one complete run under valgrind"
+bash scripts/memcheck.sh
 run_preset asan
 bash scripts/wine-prefix.sh
 run_preset windows
+WINEPREFIX="${WINEPREFIX:-${TMPDIR:-/tmp}/fringe-wine-prefix}" wineserver -k >/dev/null 2>&1 || true
 echo "== format"
 bash scripts/check-format.sh
 echo "all presets passed"

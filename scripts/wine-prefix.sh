@@ -1,10 +1,9 @@
 #!/usr/bin/env bash
-# Prepares the private Wine prefix once and keeps a wineserver alive for the
-# test run, so that each Windows test process starts in milliseconds.
+# Prepares the private Wine prefix and starts its server and background services
+# detached from any test's output, so that each Windows test starts in milliseconds
+# and no test's pipe is held open by a Wine service. `wineserver -k` ends them.
 set -euo pipefail
 export WINEPREFIX="${WINEPREFIX:-${TMPDIR:-/tmp}/fringe-wine-prefix}"
 export WINEDEBUG=-all WINEDLLOVERRIDES="mscoree,mshtml="
-if [ ! -f "$WINEPREFIX/system.reg" ]; then
-  wineboot -i >/dev/null 2>&1 || true
-fi
-wineserver -p 600 >/dev/null 2>&1 || true
+wineserver -p >/dev/null 2>&1 </dev/null || true
+wineboot -i >/dev/null 2>&1 </dev/null || true

@@ -12,15 +12,16 @@ Document::Document(int32_t width_, int32_t height_, int channels, bool transpare
       filterRect{0, 0, height_, width_},
       filterCase(static_cast<int16_t>(transparency_ ? 4 : 1)) {}
 
-void Document::SetPixels(std::vector<uint8_t> pixels, std::ptrdiff_t rowBytes) {
+void Document::SetPixels(std::vector<uint8_t> pixels, std::ptrdiff_t rowBytes,
+                         int32_t pixelPlanes) {
   owned_ = std::move(pixels);
-  BorrowPixels(owned_.data(), rowBytes);
+  BorrowPixels(owned_.data(), rowBytes, pixelPlanes);
 }
 
-void Document::BorrowPixels(const uint8_t* pixels, std::ptrdiff_t rowBytes) {
+void Document::BorrowPixels(const uint8_t* pixels, std::ptrdiff_t rowBytes, int32_t pixelPlanes) {
   pixels_ = pixels;
   rowBytes_ = rowBytes;
-  storedPlanes_ = planes;
+  storedPlanes_ = pixelPlanes > 0 ? pixelPlanes : planes;
 }
 
 uint8_t Document::Sample(int32_t row, int32_t column, int32_t plane) const {

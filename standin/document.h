@@ -33,11 +33,12 @@ class Document {
   int16_t filterCase = 1;
   int32_t maxSpace = 1 << 30;  // the largest memory budget announced at prepare
 
-  // Pixels, planes of a pixel together, `rowBytes` from one row to the next.
-  // Without pixels every sample reads as the fill value.
-  void SetPixels(std::vector<uint8_t> pixels, std::ptrdiff_t rowBytes);
+  // Pixels, the `pixelPlanes` planes of a pixel together (0: as many as the
+  // document announces now), `rowBytes` from one row to the next. Without
+  // pixels every sample reads as the fill value.
+  void SetPixels(std::vector<uint8_t> pixels, std::ptrdiff_t rowBytes, int32_t pixelPlanes = 0);
   // Uses the caller's pixels, which must outlive every run on this document.
-  void BorrowPixels(const uint8_t* pixels, std::ptrdiff_t rowBytes);
+  void BorrowPixels(const uint8_t* pixels, std::ptrdiff_t rowBytes, int32_t pixelPlanes = 0);
   void SetFill(uint8_t value) { fill_ = value; }
 
   // Plane `plane` of pixel (row, column) of the document; planes beyond the

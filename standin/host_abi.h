@@ -30,10 +30,10 @@ using RecoverSpaceProc = void (*)(int32_t size);                     // 7
 using ReleaseHandleProc = void (*)(Handle handle);                   // 8
 
 // Data-record procedures, by position; indexes are 1-based.
-using CountRecordsProc = int16_t (*)(uint32_t type);                 // 1
-using GetRecordProc = Handle (*)(uint32_t type, int16_t index);      // 2
-using DeleteRecordProc = int16_t (*)(uint32_t type, int16_t index);  // 3
-using AddRecordProc = int16_t (*)(uint32_t type, Handle handle);     // 4
+using CountRecordsProc = int16_t (*)(uint32_t type);              // 1
+using GetRecordProc = Handle (*)(uint32_t type, int16_t index);   // 2
+using DeleteRecordProc = void (*)(uint32_t type, int16_t index);  // 3
+using AddRecordProc = int16_t (*)(uint32_t type, Handle handle);  // 4
 
 // Property procedures.
 using GetPropertyProc = int16_t (*)(uint32_t signature, uint32_t key, int32_t index,

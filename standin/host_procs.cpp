@@ -149,20 +149,19 @@ class ProcImpl {
       return record == nullptr ? nullptr : host.RecordHandle(*record, type, index);
     });
   }
-  static int16_t DeleteRecord(uint32_t type, int16_t index) {
-    return Guard<int16_t>(Proc::RecordDelete, Abi::kParamError, [&](Host& host) -> int16_t {
-      if (auto error = host.Enter(Proc::RecordDelete, 0, index)) {
-        return static_cast<int16_t>(*error);
-      }
+  // The table's delete answers nothing: a failure can only be seen in the
+  // records that are left.
+  static void DeleteRecord(uint32_t type, int16_t index) {
+    GuardVoid(Proc::RecordDelete, [&](Host& host) {
+      if (host.Enter(Proc::RecordDelete, 0, index)) return;
       const StoredRecord* record = host.document_.Store().Get(type, index);
       if (record == nullptr) {
         host.Note("delete of record '" + FourCCText(type) + "' " + std::to_string(index) +
                   ", which does not exist");
-        return Abi::kParamError;
+        return;
       }
       Forget(host, record->serial);
       host.document_.Store().Delete(type, index);
-      return Abi::kNoError;
     });
   }
   static int16_t AddRecord(uint32_t type, Abi::Handle handle) {

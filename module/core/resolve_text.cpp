@@ -1,13 +1,13 @@
-// Resolving a key string into the text that is shown: its default text.
+// Resolving a text that is about to be shown: key strings go through the
+// run's cache, the host's translation or their default text.
 #include "core/resolve_text.h"
+
+#include "core/run_key_strings.h"
 
 namespace Vireo {
 
 void ResolveText(CText& text) {
-  const std::string& bytes = text.Utf8();
-  if (bytes.size() < 3 || bytes.compare(0, 3, "$$$") != 0) return;
-  const size_t equals = bytes.find('=', 3);
-  text = equals == std::string::npos ? CText() : CText::FromUtf8(bytes.substr(equals + 1));
+  LocalizeString(text);
 }
 
 }  // namespace Vireo

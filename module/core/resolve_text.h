@@ -6,8 +6,8 @@
 
 namespace Vireo {
 
-// A key string ("$$$/Key/Path=Default text") becomes its default text (empty
-// when it has no '='); any other text is left as it is.
+// A key string ("$$$/Key/Path=Default text") becomes its translation or its
+// unescaped default text; any other text is left as it is.
 void ResolveText(CText& text);
 
 }  // namespace Vireo

@@ -24,7 +24,9 @@ FrameView FrameViewFromRecord(const Vireo::FilterRecord& record) {
   frame.outRect = ToRect(record.outRect);
   frame.outData = static_cast<const uint8_t*>(record.outData);
   frame.outRowBytes = record.outRowBytes;
-  frame.outColumnBytes = record.outColumnBytes;
+  // A host that leaves the output column distance at 0 does not report it: the
+  // output is then read with the input's, as the host lays both out alike.
+  frame.outColumnBytes = record.outColumnBytes != 0 ? record.outColumnBytes : record.inColumnBytes;
   return frame;
 }
 

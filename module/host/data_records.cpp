@@ -43,17 +43,14 @@ void CRastrixPlugin::PublishDataRecord(uint32_t type, const void* bytes, int32_t
     if (GetDataRecord(type, position) != nullptr) DeleteDataRecord(type, position);
   }
   HostHandle handle = NewHostHandle(size);
-  void* data = LockHostHandle(handle, false);
-  if (data == nullptr) {
-    UnlockHostHandle(handle);
-    DisposeHostHandle(handle);
-    return;
-  }
-  std::memcpy(data, bytes, static_cast<size_t>(size));
   try {
-    AddDataRecord(type, handle);
+    if (void* data = LockHostHandle(handle, false); data != nullptr) {
+      std::memcpy(data, bytes, static_cast<size_t>(size));
+      AddDataRecord(type, handle);
+    }
   } catch (...) {
-    // The host keeps its own copy only on success; ours must go either way.
+    // The host keeps its own copy only on success; ours must go either way,
+    // even when a host procedure throws.
     UnlockHostHandle(handle);
     DisposeHostHandle(handle);
     throw;

@@ -17,13 +17,26 @@ bool WriteDescriptor(const HandleProcTable* handleProcs, DescriptorParameters* p
     error = kMemFullErr;
     return false;
   }
-  const bool put = putKeys != nullptr && putKeys(parameters, token, error);
+  const auto close = TableProc<CloseWriteDescriptorProc>(writeProcs, 2);
+  const auto dispose = TableProc<DisposeHandleProc>(handleProcs, 2);
+  bool put = false;
+  try {
+    put = putKeys != nullptr && putKeys(parameters, token, error);
+  } catch (...) {
+    // A put that throws out of the host must not cost the host the token it
+    // opened; what was written so far is incomplete and is not published.
+    if (close != nullptr) {
+      HostHandle partial = nullptr;
+      close(token, &partial);
+      if (partial != nullptr && dispose != nullptr) dispose(partial);
+    }
+    throw;
+  }
   if (HostHandle previous = parameters->descriptor; previous != nullptr) {
-    if (const auto dispose = TableProc<DisposeHandleProc>(handleProcs, 2)) dispose(previous);
+    if (dispose != nullptr) dispose(previous);
     parameters->descriptor = nullptr;
   }
   HostHandle written = nullptr;
-  const auto close = TableProc<CloseWriteDescriptorProc>(writeProcs, 2);
   error = close != nullptr ? close(token, &written) : int16_t{0};
   parameters->descriptor = written;
   return error == 0 && put;

@@ -8,6 +8,7 @@
 #include <cstdint>
 
 #include "core/process.h"
+#include "host/buffer_procs.h"
 #include "host/filter_record.h"
 #include "host/host_types.h"
 #include "host/suite_catalog.h"
@@ -47,6 +48,8 @@ class CRastrixPlugin : public CProcess {
   // Suites: acquired on first request and cached; a failed acquisition is
   // tried again at the next request.
   const void* Suite(SuiteId id);
+  // The cached suite pointer, without trying to acquire it.
+  const void* CachedSuite(SuiteId id) const { return suites_.at(static_cast<size_t>(id)); }
 
   // Host properties.
   bool HasPropertyProcs() const;
@@ -65,6 +68,15 @@ class CRastrixPlugin : public CProcess {
   // The host's start flag ('zScW'), kept for the windowing toolkit.
   bool HostStartFlag() const { return hostStartFlag_; }
   void ReadHostStartFlag();
+
+  // Host buffers. Allocation raises the host's code, or -108 when no buffer
+  // came back or the procedure is missing.
+  bool HasBufferProcs() const;
+  HostBufferId AllocateHostBuffer(int32_t size);
+  void* LockHostBuffer(HostBufferId id, bool moveHigh);
+  void UnlockHostBuffer(HostBufferId id);
+  void FreeHostBuffer(HostBufferId id);
+  int32_t GetHostBufferSpace();
 
   // Host handles.
   bool HasHandleProcs() const;

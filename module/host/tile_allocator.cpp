@@ -1,11 +1,11 @@
-// The module-wide tile allocator slot.
+// The module-wide tile allocator slot. Tile blocks share ownership of the
+// allocator they came from, so that a block is always given back to the place
+// it was taken from, even after the slot has moved on.
 #include "host/tile_allocator.h"
-
-#include <memory>
 
 namespace Vireo {
 namespace {
-std::unique_ptr<CVirtualAllocator> g_tileAllocator;
+std::shared_ptr<CVirtualAllocator> g_tileAllocator;
 }
 
 void InstallTileAllocator(CVirtualAllocator* allocator) {
@@ -15,6 +15,10 @@ void InstallTileAllocator(CVirtualAllocator* allocator) {
 
 CVirtualAllocator* InstalledTileAllocator() {
   return g_tileAllocator.get();
+}
+
+std::shared_ptr<CVirtualAllocator> SharedTileAllocator() {
+  return g_tileAllocator;
 }
 
 }  // namespace Vireo

@@ -14,18 +14,19 @@
 #include "filter/analysis/edge_map.h"
 #include "filter/analysis/edge_points.h"
 #include "filter/analysis/profiles.h"
+#include "golden_pages.h"
 #include "test_frame.h"
 
 namespace {
 
 using namespace Project;
 using AnalysisTest::CountingHost;
+using AnalysisTest::GoldenPage;
+using AnalysisTest::GoldenPages;
 using AnalysisTest::TestFrame;
 
+// Expected values of GoldenPages(), in the same order.
 struct Golden {
-  const char* name;
-  Synth::PageSpec spec;
-  int16_t filterCase;
   PositionClass position;
   int32_t points;
   uint64_t centreX;  // bits of the column centroid
@@ -35,56 +36,30 @@ struct Golden {
   int32_t progressSteps;
 };
 
-Synth::PageSpec Spec(int width, int height, bool color, bool alpha, uint8_t pageAlpha,
-                     bool lidShadow, Synth::PhotoSpec photo, uint32_t seed) {
-  Synth::PageSpec spec;
-  spec.width = width;
-  spec.height = height;
-  spec.color = color;
-  spec.alpha = alpha;
-  spec.pageAlpha = pageAlpha;
-  spec.lidShadow = lidShadow;
-  spec.photo = photo;
-  spec.seed = seed;
-  return spec;
-}
-
 std::vector<Golden> Goldens() {
   return {
-      {"RGB, 11.5 degrees",
-       Spec(600, 450, true, false, 255, false, {310, 215, 270, 190, 11.5}, 101),
-       1,
-       kInside,
+      {kInside,
        1092,
        0x4073074fdc0c1768ULL,
        0x406c1a862f5d2461ULL,
        0x4027411983143bd2ULL,
        {{{148, 157}, {94, 422}, {280, 460}, {334, 196}}},
        2935},
-      {"gray, lid shadow, -23 degrees",
-       Spec(640, 480, false, false, 255, true, {300, 250, 300, 200, -23.0}, 102),
-       1,
-       kTouching,
+      {kTouching,
        1314,
        0x4073464d4d6f9182ULL,
        0x406accb6df395ebdULL,
        0xc03704cc6a86d67eULL,
        {{{99, 200}, {216, 476}, {400, 398}, {283, 122}}},
        3135},
-      {"RGB with transparency, filter case 5, 4.5 degrees",
-       Spec(500, 400, true, true, 60, false, {260, 190, 230, 160, 4.5}, 103),
-       5,
-       kInside,
+      {kInside,
        848,
        0x4070304cb5627c53ULL,
        0x4068760ec011d059ULL,
        0x4013db6db6db6db7ULL,
        {{{119, 137}, {99, 367}, {259, 381}, {279, 151}}},
        2535},
-      {"gray, upright",
-       Spec(560, 420, false, false, 255, false, {280, 200, 250, 180, 0.0}, 104),
-       1,
-       kInside,
+      {kInside,
        868,
        0x407181c36fc34aa5ULL,
        0x406a08b62f096bbeULL,
@@ -95,12 +70,18 @@ std::vector<Golden> Goldens() {
 }
 
 TEST(GoldenTest, StagesAndRecordOfFixedPages) {
-  for (const Golden& g : Goldens()) {
-    const Synth::Page page = Synth::GeneratePage(g.spec);
+  const std::vector<GoldenPage> pages = GoldenPages();
+  const std::vector<Golden> goldens = Goldens();
+  ASSERT_EQ(pages.size(), goldens.size());
+  for (size_t i = 0; i < pages.size(); ++i) {
+    const Golden& g = goldens[i];
+    const char* const name = pages[i].name;
+    const int16_t filterCase = pages[i].filterCase;
+    const Synth::Page page = Synth::GeneratePage(pages[i].spec);
 
     // The first half and the edge search, stage by stage.
     TestFrame traced(page);
-    traced.View().filterCase = g.filterCase;
+    traced.View().filterCase = filterCase;
     CountingHost quiet;
     ProgressCounter progress;
     DoubleList columns;
@@ -108,33 +89,32 @@ TEST(GoldenTest, StagesAndRecordOfFixedPages) {
     ASSERT_TRUE(AllocList(columns, page.width));
     ASSERT_TRUE(AllocList(rows, page.height));
     ComputeProfiles(traced.View(), quiet, columns, rows, progress);
-    EXPECT_EQ(std::bit_cast<uint64_t>(ProfileCentroid(columns)), g.centreX) << g.name;
-    EXPECT_EQ(std::bit_cast<uint64_t>(ProfileCentroid(rows)), g.centreY) << g.name;
-    EXPECT_EQ(ClassifyPosition(columns, rows, 10.0), g.position) << g.name;
+    EXPECT_EQ(std::bit_cast<uint64_t>(ProfileCentroid(columns)), g.centreX) << name;
+    EXPECT_EQ(std::bit_cast<uint64_t>(ProfileCentroid(rows)), g.centreY) << name;
+    EXPECT_EQ(ClassifyPosition(columns, rows, 10.0), g.position) << name;
     BuildEdgeMap(traced.View(), quiet, 60, progress);
     DoubleList xs;
     DoubleList ys;
     const Rect search{9, 9, static_cast<int16_t>(page.height - 9),
                       static_cast<int16_t>(page.width - 9)};
-    ASSERT_TRUE(FindEdgePoints(traced.View(), quiet, search, xs, ys, progress)) << g.name;
-    EXPECT_EQ(xs.count, g.points) << g.name;
+    ASSERT_TRUE(FindEdgePoints(traced.View(), quiet, search, xs, ys, progress)) << name;
+    EXPECT_EQ(xs.count, g.points) << name;
 
     // The whole run.
     TestFrame frame(page);
-    frame.View().filterCase = g.filterCase;
+    frame.View().filterCase = filterCase;
     CountingHost host;
     AnalysisResult result;
     RunAnalysis(frame.View(), host, result);
-    ASSERT_EQ(host.records.size(), 1U) << g.name;
-    ASSERT_FALSE(host.records[0].empty) << g.name;
-    EXPECT_EQ(host.records[0].confidence, 255) << g.name;
-    EXPECT_EQ(std::bit_cast<uint64_t>(result.angle), g.angle)
-        << g.name << ": angle " << result.angle;
+    ASSERT_EQ(host.records.size(), 1U) << name;
+    ASSERT_FALSE(host.records[0].empty) << name;
+    EXPECT_EQ(host.records[0].confidence, 255) << name;
+    EXPECT_EQ(std::bit_cast<uint64_t>(result.angle), g.angle) << name << ": angle " << result.angle;
     for (int k = 0; k < 4; ++k) {
-      EXPECT_EQ(host.records[0].corners.corner[k].v, g.corners[k][0]) << g.name << " corner " << k;
-      EXPECT_EQ(host.records[0].corners.corner[k].h, g.corners[k][1]) << g.name << " corner " << k;
+      EXPECT_EQ(host.records[0].corners.corner[k].v, g.corners[k][0]) << name << " corner " << k;
+      EXPECT_EQ(host.records[0].corners.corner[k].h, g.corners[k][1]) << name << " corner " << k;
     }
-    EXPECT_EQ(host.progressCalls, g.progressSteps) << g.name;
+    EXPECT_EQ(host.progressCalls, g.progressSteps) << name;
   }
 }
 

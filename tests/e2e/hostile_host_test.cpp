@@ -1,6 +1,8 @@
 // A broken or hostile host: what the module can check it checks, and answers
 // with the whole-document failure record instead of reading memory it was not
 // given. Every case must run clean under the sanitizers too.
+#include <algorithm>
+
 #include "e2e_support.h"
 
 namespace {
@@ -148,6 +150,40 @@ TEST_F(HostileHost, MissingProceduresAreDoneWithoutOrAnsweredWithACode) {
     host_->Faults().Restore(proc);
     host_->Problems().Clear();
   }
+}
+
+TEST_F(HostileHost, ADescriptorPutThatThrowsStillClosesItsToken) {
+  // The angle is the one float; integers come before and after it.
+  for (auto [put, call] :
+       {std::pair{Proc::DescriptorPutInteger, 1}, std::pair{Proc::DescriptorPutInteger, 2},
+        std::pair{Proc::DescriptorPutFloat, 1}}) {
+    {
+      host_->Faults().RaiseAt(put, call);
+      Standin::RunReport report = host_->Run();
+      EXPECT_EQ(std::count(report.results.begin(), report.results.end(), int16_t{1}), 1)
+          << Standin::ProcName(put) << " " << call;
+      // The incomplete descriptor is not handed over.
+      EXPECT_FALSE(host_->LastDescriptor().has_value());
+      EXPECT_EQ(host_->Calls(Proc::DescriptorClose), host_->Calls(Proc::DescriptorOpen));
+      ExpectClean(*host_);
+      EXPECT_EQ(TakeAlerts().size(), 1u);
+      host_->Faults().Restore(put);
+      host_->Faults().ResetCalls();
+    }
+  }
+}
+
+TEST_F(HostileHost, ALockThatThrowsWhilePublishingLosesNoHandle) {
+  // The record's handle is the last one locked before it is published.
+  host_->Run();
+  const int32_t locks = host_->Calls(Proc::HandleLock);
+  ASSERT_GT(locks, 0);
+  host_->Faults().ResetCalls();
+  host_->Faults().RaiseAt(Proc::HandleLock, locks);
+  host_->Run();
+  EXPECT_EQ(host_->Calls(Proc::HandleDispose), host_->Calls(Proc::HandleNew));
+  ExpectClean(*host_);
+  EXPECT_EQ(TakeAlerts().size(), 1u);
 }
 
 TEST_F(HostileHost, MissingOrEmptyTablesAreDoneWithout) {

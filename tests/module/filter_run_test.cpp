@@ -151,6 +151,21 @@ TEST_F(FilterRunTest, ACompleteRunPublishesWhatTheAnalysisFinds) {
   EXPECT_TRUE(alerts_.Lines().empty());
 }
 
+TEST_F(FilterRunTest, AHostThatDoesNotReportTheOutputColumnDistanceIsReadLikeTheInput) {
+  const Synth::Page page = PhotoPage(400, 300, 7.0);
+  LoadPage(page);
+  ASSERT_EQ(Run(), kAllSucceed);
+  int16_t reported[9];
+  ASSERT_TRUE(host_.FringeRecordValues(reported));
+  ASSERT_EQ(reported[8], 255);
+
+  host_.reportsOutputColumns = false;
+  ASSERT_EQ(Run(), kAllSucceed);
+  int16_t unreported[9];
+  ASSERT_TRUE(host_.FringeRecordValues(unreported));
+  for (int k = 0; k < 9; ++k) EXPECT_EQ(unreported[k], reported[k]) << k;
+}
+
 TEST_F(FilterRunTest, AFailedAdvanceStateWritesTheFailureRecordAndNoDescriptor) {
   host_.SetDocument(480, 640, 3, 3);
   host_.FailAt(Proc::kAdvanceState, 1, -108);

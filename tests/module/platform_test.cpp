@@ -4,6 +4,7 @@
 
 #include <filesystem>
 #include <fstream>
+#include <random>
 #include <sstream>
 #include <thread>
 
@@ -144,10 +145,12 @@ TEST(OSThrowTest, TracesFromOtherThreadsTravelToTheMainThread) {
   Vireo::SetMainThreadId(Platform::CurrentThreadId());
   const std::string trace = Platform::TraceFilePath(Vireo::kDebugTracePath);
   Vireo::CProcess process;
-  std::thread([] { Vireo::DebugTrace("From a worker", "worker.cpp", 99, false); }).join();
-  EXPECT_EQ(ReadFile(trace).find("From a worker,worker.cpp,99"), std::string::npos);
+  // The trace file outlives test processes: a message of this run's own tells them apart.
+  const std::string message = "From worker " + std::to_string(std::random_device{}());
+  std::thread([&message] { Vireo::DebugTrace(message.c_str(), "worker.cpp", 99, false); }).join();
+  EXPECT_EQ(ReadFile(trace).find(message + ",worker.cpp,99"), std::string::npos);
   process.HandlePendingEvents();
-  EXPECT_NE(ReadFile(trace).find("From a worker,worker.cpp,99"), std::string::npos);
+  EXPECT_NE(ReadFile(trace).find(message + ",worker.cpp,99"), std::string::npos);
 }
 
 }  // namespace

@@ -103,7 +103,7 @@ TEST(TextTest, KeyStringsResolveToTheirDefaultText) {
   EXPECT_EQ(Resolved("$$$/Vireo/Reporter/Title=Error"), "Error");
   EXPECT_EQ(Resolved("$$$/Only/A/Key"), "");
   EXPECT_EQ(Resolved("$$/Not/A/Key=Text"), "$$/Not/A/Key=Text");
-  EXPECT_EQ(Resolved("$$$=Text"), "Text");
+  EXPECT_EQ(Resolved("$$$=Text"), "");  // an empty key resolves to nothing
   EXPECT_EQ(Resolved("plain"), "plain");
 }
 

@@ -158,3 +158,24 @@ TEST_F(AdvanceState, DeliveryHookPlaysABrokenHost) {
 }
 
 }  // namespace
+
+namespace {
+
+TEST(DocumentPixels, PlanesAnnouncedBeyondThoseStoredReadAsZero) {
+  Standin::Document document(4, 2, 3);
+  std::vector<uint8_t> pixels(4 * 2 * 3);
+  for (size_t i = 0; i < pixels.size(); ++i) pixels[i] = static_cast<uint8_t>(i + 1);
+  document.SetPixels(pixels, 12);
+  document.planes = 5;  // a host announcing more planes than the pixels carry
+  EXPECT_EQ(document.Sample(1, 2, 0), pixels[12 + 6]);
+  EXPECT_EQ(document.Sample(1, 2, 2), pixels[12 + 8]);
+  EXPECT_EQ(document.Sample(1, 2, 4), 0);
+
+  Standin::Document announced(4, 2, 3);
+  announced.planes = 5;
+  announced.SetPixels(pixels, 12, 3);  // the layout named outright
+  EXPECT_EQ(announced.Sample(1, 3, 1), pixels[12 + 10]);
+  EXPECT_EQ(announced.Sample(1, 3, 3), 0);
+}
+
+}  // namespace

@@ -89,8 +89,8 @@ class HostSide {
   void* GetRecord(uint32_t type, int16_t index) const {
     return Proc<void* (*)(uint32_t, int16_t)>(RecordTable(), 2)(type, index);
   }
-  int16_t DeleteRecord(uint32_t type, int16_t index) const {
-    return Proc<int16_t (*)(uint32_t, int16_t)>(RecordTable(), 3)(type, index);
+  void DeleteRecord(uint32_t type, int16_t index) const {
+    Proc<void (*)(uint32_t, int16_t)>(RecordTable(), 3)(type, index);
   }
   int16_t AddRecord(uint32_t type, void* handle) const {
     return Proc<int16_t (*)(uint32_t, void*)>(RecordTable(), 4)(type, handle);

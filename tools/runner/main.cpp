@@ -49,10 +49,10 @@ Standin::Document MakeDocument(const Runner::Options& options) {
   size_t rowBytes = static_cast<size_t>(options.width) * static_cast<size_t>(planes);
   if (!options.rawFile.empty()) {
     document.SetPixels(ReadRaw(options.rawFile, rowBytes * static_cast<size_t>(options.height)),
-                       static_cast<std::ptrdiff_t>(rowBytes));
+                       static_cast<std::ptrdiff_t>(rowBytes), planes);
   } else {
     Synth::Page page = Synth::GeneratePage(options.page);
-    document.SetPixels(std::move(page.pixels), static_cast<std::ptrdiff_t>(rowBytes));
+    document.SetPixels(std::move(page.pixels), static_cast<std::ptrdiff_t>(rowBytes), planes);
   }
   return document;
 }

@@ -120,11 +120,18 @@ class RowTerms {
   // Makes the terms of source row `row` from its bytes.
   void Make(int32_t row, const uint8_t* __restrict bytes, int32_t lanes, int32_t step,
             int16_t channels) {
+    int16_t* __restrict d = Difference(row);
+    int16_t* __restrict s = Smooth(row);
+    if (channels == 1) {
+      // One channel: the sums are the bytes themselves.
+      for (int32_t i = step; i < lanes - step; ++i) {
+        d[i] = static_cast<int16_t>(bytes[i + step] - bytes[i - step]);
+        s[i] = static_cast<int16_t>(bytes[i - step] + 2 * bytes[i] + bytes[i + step]);
+      }
+      return;
+    }
     int16_t* __restrict p = sums_.get();
     switch (channels) {
-      case 1:
-        for (int32_t i = 0; i < lanes; ++i) p[i] = bytes[i];
-        break;
       case 2:
         for (int32_t i = 0; i < lanes; ++i) p[i] = static_cast<int16_t>(bytes[i] + bytes[i + 1]);
         break;
@@ -139,8 +146,6 @@ class RowTerms {
         }
         break;
     }
-    int16_t* __restrict d = Difference(row);
-    int16_t* __restrict s = Smooth(row);
     for (int32_t i = step; i < lanes - step; ++i) {
       d[i] = static_cast<int16_t>(p[i + step] - p[i - step]);
       s[i] = static_cast<int16_t>(p[i - step] + 2 * p[i] + p[i + step]);
@@ -157,20 +162,37 @@ class RowTerms {
 };
 
 // The edge test for thresholds up to kSmallThreshold, in 16-bit lanes: with
-// |gx| and |gy| capped at 3t + 1 the sum of squares stays below 2^16, and a
-// capped value alone already exceeds 9t^2, so the answer is unchanged.
+// gx and gy clamped into -(3t + 1) ... 3t + 1 each square stays below 2^15 and a capped
+// value alone already exceeds 9t^2, so the answer is unchanged; and
+// gx^2 + gy^2 > 9t^2 is asked as gx^2 > 9t^2 - gy^2, both sides in 16 bits.
 constexpr int32_t kSmallThreshold = 60;
 
 struct SmallTest {
-  int16_t cap;     // 3t + 1
-  uint16_t limit;  // 9t^2
+  int16_t cap;    // 3t + 1
+  int16_t limit;  // 9t^2
 
   uint8_t operator()(int16_t gx, int16_t gy) const {
-    const auto ax = static_cast<int16_t>(std::min<int16_t>(gx < 0 ? -gx : gx, cap));
-    const auto ay = static_cast<int16_t>(std::min<int16_t>(gy < 0 ? -gy : gy, cap));
-    return static_cast<uint16_t>(ax * ax + ay * ay) > limit ? kEdge : kNoEdge;
+    // Clamped into -cap ... cap: the squares are those of the capped magnitudes.
+    const auto ax = std::clamp<int16_t>(gx, static_cast<int16_t>(-cap), cap);
+    const auto ay = std::clamp<int16_t>(gy, static_cast<int16_t>(-cap), cap);
+    const auto squareX = static_cast<int16_t>(ax * ax);
+    const auto rest = static_cast<int16_t>(limit - ay * ay);
+    return squareX > rest ? kEdge : kNoEdge;
   }
 };
+
+// Asks for a row's bytes ahead of their use, so that fetching the next rows
+// overlaps the work on this one. A hint only: it changes no result.
+void PrefetchRow(const uint8_t* row, int32_t bytes, bool forWriting) {
+  constexpr int32_t kCacheLine = 64;
+  for (int32_t i = 0; i < bytes; i += kCacheLine) {
+    if (forWriting) {
+      __builtin_prefetch(row + i, 1);
+    } else {
+      __builtin_prefetch(row + i, 0);
+    }
+  }
+}
 
 struct WideTest {
   int32_t limit;
@@ -242,10 +264,14 @@ bool LaneMap(const FrameView& frame, AnalysisHost& host, const MapExtent& e,
   for (int32_t y = 1; y <= e.height - 4; ++y) {
     if (CancelRequested(host)) return true;
     TakeProgressStep(progress, host);
+    if (y + 2 <= e.height - 3) {
+      PrefetchRow(source(y + 2), lanes, false);
+      PrefetchRow(PixelAt(frame.inData, 0, y + 1, frame.inRowBytes, step), lanes, true);
+    }
     terms.Make(y + 1, source(y + 1), lanes, step, e.channels);
     uint8_t* target = PixelAt(frame.inData, 0, y, frame.inRowBytes, step);
     if (small) {
-      LaneRow(terms, y, first, last, SmallTest{cap, static_cast<uint16_t>(e.limit)}, keep.get(),
+      LaneRow(terms, y, first, last, SmallTest{cap, static_cast<int16_t>(e.limit)}, keep.get(),
               target);
     } else {
       LaneRow(terms, y, first, last, WideTest{e.limit}, keep.get(), target);

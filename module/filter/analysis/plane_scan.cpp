@@ -6,7 +6,10 @@
 namespace Project {
 namespace {
 
-constexpr int32_t kChunk = 64;  // pixels ruled out together
+// Pixels ruled out together: wide chunks first, then the narrow ones of a
+// wide chunk that holds a dark byte.
+constexpr int32_t kWideChunk = 512;
+constexpr int32_t kChunk = 32;
 
 uint8_t SmallestByte(const uint8_t* bytes, std::ptrdiff_t count) {
   uint8_t smallest = 255;
@@ -24,22 +27,30 @@ bool PlaneScanner::MayHoldEdge(const uint8_t* first, int32_t a, int32_t b) const
 }
 
 int32_t PlaneScanner::First(const uint8_t* first, int32_t count) const {
-  for (int32_t a = 0; a < count; a += kChunk) {
-    const int32_t b = std::min(count, a + kChunk);
+  for (int32_t a = 0; a < count; a += kWideChunk) {
+    const int32_t b = std::min(count, a + kWideChunk);
     if (!MayHoldEdge(first, a, b)) continue;
-    for (int32_t i = a; i < b; ++i) {
-      if (IsEdge(At(first, i))) return i;
+    for (int32_t c = a; c < b; c += kChunk) {
+      const int32_t d = std::min(b, c + kChunk);
+      if (!MayHoldEdge(first, c, d)) continue;
+      for (int32_t i = c; i < d; ++i) {
+        if (IsEdge(At(first, i))) return i;
+      }
     }
   }
   return -1;
 }
 
 int32_t PlaneScanner::Last(const uint8_t* first, int32_t count) const {
-  for (int32_t b = count; b > 0; b -= kChunk) {
-    const int32_t a = std::max(0, b - kChunk);
+  for (int32_t b = count; b > 0; b -= kWideChunk) {
+    const int32_t a = std::max(0, b - kWideChunk);
     if (!MayHoldEdge(first, a, b)) continue;
-    for (int32_t i = b - 1; i >= a; --i) {
-      if (IsEdge(At(first, i))) return i;
+    for (int32_t d = b; d > a; d -= kChunk) {
+      const int32_t c = std::max(a, d - kChunk);
+      if (!MayHoldEdge(first, c, d)) continue;
+      for (int32_t i = d - 1; i >= c; --i) {
+        if (IsEdge(At(first, i))) return i;
+      }
     }
   }
   return -1;

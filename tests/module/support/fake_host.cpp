@@ -129,7 +129,7 @@ int16_t FakeHost::AdvanceState() {
   r.inRowBytes = width * delivered;
   r.outRowBytes = width * delivered;
   r.inColumnBytes = delivered;
-  r.outColumnBytes = delivered;
+  r.outColumnBytes = host.reportsOutputColumns ? delivered : 0;
   return 0;
 }
 

@@ -81,6 +81,8 @@ class FakeHost {
   int abortCalls = 0;
   std::vector<std::pair<int32_t, int32_t>> progress;
   int advanceCalls = 0;
+  // False: advance state leaves the output column distance at 0, unreported.
+  bool reportsOutputColumns = true;
   std::vector<std::string> suiteAcquisitions;  // "name/version"
   std::vector<std::string> suiteReleases;
   std::vector<uint32_t> propertyReads;

@@ -1,0 +1,123 @@
+# Turns typed fields into the bytes the host parses: little-endian integers,
+# four-character codes, length-prefixed and NUL-terminated strings.
+#
+# A byte list is a CMake list of two-digit upper-case hexadecimal strings.
+
+# Appends the low `count` bytes of the integer `value`, least significant first.
+function(encode_integer out value count)
+  if(NOT value MATCHES "^(0x[0-9A-Fa-f]+|[0-9]+)$")
+    message(FATAL_ERROR "Resource field: \"${value}\" is not a non-negative integer")
+  endif()
+  math(EXPR limit "1 << (8 * ${count})")
+  math(EXPR number "${value}")
+  if(number GREATER_EQUAL limit)
+    message(FATAL_ERROR "Resource field: ${value} does not fit in ${count} byte(s)")
+  endif()
+  set(bytes ${${out}})
+  foreach(i RANGE 1 ${count})
+    math(EXPR byte "${number} & 255" OUTPUT_FORMAT HEXADECIMAL)
+    math(EXPR number "${number} >> 8")
+    string(SUBSTRING "${byte}" 2 -1 digits)
+    string(LENGTH "${digits}" width)
+    if(width EQUAL 1)
+      set(digits "0${digits}")
+    endif()
+    string(TOUPPER "${digits}" digits)
+    list(APPEND bytes ${digits})
+  endforeach()
+  set(${out} ${bytes} PARENT_SCOPE)
+endfunction()
+
+# Appends the bytes of a 7-bit text as they stand, without length or terminator.
+function(encode_text out text)
+  if(NOT text STREQUAL "" AND NOT text MATCHES "^[ -~]+$")
+    message(FATAL_ERROR "Resource field: \"${text}\" holds characters outside printable ASCII")
+  endif()
+  string(HEX "${text}" hex)
+  string(TOUPPER "${hex}" hex)
+  string(REGEX MATCHALL ".." pairs "${hex}")
+  set(${out} ${${out}} ${pairs} PARENT_SCOPE)
+endfunction()
+
+# A four-character code is a 32-bit integer whose most significant byte is the
+# first character; stored little-endian, the characters come out reversed.
+function(encode_code out code)
+  string(LENGTH "${code}" length)
+  if(NOT length EQUAL 4)
+    message(FATAL_ERROR "Resource field: code \"${code}\" must have four characters")
+  endif()
+  set(forward "")
+  encode_text(forward "${code}")
+  list(REVERSE forward)
+  set(${out} ${${out}} ${forward} PARENT_SCOPE)
+endfunction()
+
+# One length byte, then the text.
+function(encode_pstring out text)
+  string(LENGTH "${text}" length)
+  if(length GREATER 255)
+    message(FATAL_ERROR "Resource field: \"${text}\" is too long for a length byte")
+  endif()
+  set(bytes ${${out}})
+  encode_integer(bytes ${length} 1)
+  encode_text(bytes "${text}")
+  set(${out} ${bytes} PARENT_SCOPE)
+endfunction()
+
+# The text and one NUL byte.
+function(encode_cstring out text)
+  set(bytes ${${out}})
+  encode_text(bytes "${text}")
+  list(APPEND bytes 00)
+  set(${out} ${bytes} PARENT_SCOPE)
+endfunction()
+
+# Appends zero bytes until the list holds a multiple of `multiple` bytes.
+function(encode_padding out multiple)
+  set(bytes ${${out}})
+  list(LENGTH bytes length)
+  math(EXPR missing "(${multiple} - ${length} % ${multiple}) % ${multiple}")
+  if(missing GREATER 0)
+    foreach(i RANGE 1 ${missing})
+      list(APPEND bytes 00)
+    endforeach()
+  endif()
+  set(${out} ${bytes} PARENT_SCOPE)
+endfunction()
+
+# Encodes a sequence of typed fields, given as one list of TYPE VALUE pairs:
+#   INT8 / INT16 / INT32 n   unsigned little-endian integer
+#   CODE abcd                four-character code
+#   PSTRING text             length-prefixed string ("" for an empty one)
+#   CSTRING text             NUL-terminated string
+# Pass the list quoted so that empty strings survive.
+function(encode_fields out fields)
+  set(bytes ${${out}})
+  list(LENGTH fields count)
+  set(i 0)
+  while(i LESS count)
+    list(GET fields ${i} type)
+    math(EXPR i "${i} + 1")
+    if(i EQUAL count)
+      message(FATAL_ERROR "Resource field: ${type} has no value")
+    endif()
+    list(GET fields ${i} value)
+    math(EXPR i "${i} + 1")
+    if(type STREQUAL "INT8")
+      encode_integer(bytes "${value}" 1)
+    elseif(type STREQUAL "INT16")
+      encode_integer(bytes "${value}" 2)
+    elseif(type STREQUAL "INT32")
+      encode_integer(bytes "${value}" 4)
+    elseif(type STREQUAL "CODE")
+      encode_code(bytes "${value}")
+    elseif(type STREQUAL "PSTRING")
+      encode_pstring(bytes "${value}")
+    elseif(type STREQUAL "CSTRING")
+      encode_cstring(bytes "${value}")
+    else()
+      message(FATAL_ERROR "Resource field: unknown field type \"${type}\"")
+    endif()
+  endwhile()
+  set(${out} ${bytes} PARENT_SCOPE)
+endfunction()

@@ -1,0 +1,35 @@
+#!/usr/bin/env bash
+# Builds the fuzz preset and runs every fuzz target for a bounded time.
+#   scripts/fuzz.sh            about 60 s per target (what CI runs)
+#   scripts/fuzz.sh 3600       an hour per target
+# Each target starts from its seed corpus (fuzz/corpus/<target>) and keeps what
+# it learns in build/fuzz/corpus/<target>. A finding is written to
+# build/fuzz/findings/ and the script fails; once fixed, copy the input to
+# fuzz/regressions/<target>/ so that the replay tests keep it fixed.
+set -euo pipefail
+cd "$(dirname "$0")/.."
+seconds="${1:-60}"
+jobs="${FRINGE_JOBS:-2}"
+
+cmake --preset fuzz >/dev/null
+cmake --build --preset fuzz -j "$jobs" --target module_run_fuzzer key_strings_fuzzer page_loading_fuzzer
+
+findings=build/fuzz/findings
+mkdir -p "$findings"
+export FRINGE_ALERT_LOG=/dev/null
+export ASAN_OPTIONS="detect_leaks=1:abort_on_error=1"
+export UBSAN_OPTIONS="print_stacktrace=1:halt_on_error=1"
+status=0
+for target in module_run key_strings page_loading; do
+  corpus="build/fuzz/corpus/$target"
+  mkdir -p "$corpus"
+  echo "== $target: ${seconds} s"
+  if ! "build/fuzz/fuzz/${target}_fuzzer" -max_total_time="$seconds" -rss_limit_mb=2048 \
+      -timeout=20 -print_final_stats=1 -artifact_prefix="$findings/$target-" \
+      "$corpus" "fuzz/corpus/$target" 2>"build/fuzz/$target.log"; then
+    status=1
+    tail -n 40 "build/fuzz/$target.log"
+  fi
+  grep -E "^(Done|#[0-9]+ +DONE)|stat::number_of_executed_units" "build/fuzz/$target.log" || true
+done
+exit "$status"
