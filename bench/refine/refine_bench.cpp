@@ -73,8 +73,10 @@ class ShareReporter : public benchmark::ConsoleReporter {
   void ReportRuns(const std::vector<Run>& runs) override {
     ConsoleReporter::ReportRuns(runs);
     for (const Run& run : runs) {
-      if (run.run_type != Run::RT_Iteration || run.iterations == 0) continue;
-      const std::string name = run.benchmark_name();
+      // Single runs, or the median of repeated ones.
+      const bool median = run.run_type == Run::RT_Aggregate && run.aggregate_name == "median";
+      if (!median && (run.run_type != Run::RT_Iteration || run.iterations == 0)) continue;
+      const std::string name = run.run_name.function_name;
       const auto slash = name.find('/');
       if (slash == std::string::npos) continue;
       times_[name.substr(slash + 1)][name.substr(0, slash)] = run.GetAdjustedCPUTime();

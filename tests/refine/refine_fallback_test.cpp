@@ -143,3 +143,44 @@ TEST(RefineFallback, ModuleAnswerFromDescriptorPoints) {
 
 }  // namespace
 }  // namespace Refine
+
+namespace Refine {
+namespace {
+
+TEST(RefineFallback, AnyAnswerOnAnyPageIsHandled) {
+  // Odd pages and wild answers: off the page, degenerate, huge, tiny. Nothing
+  // is read outside the page (the sanitizers watch) and the outline is finite.
+  uint64_t state = 12345;
+  auto next = [&state](int lo, int hi) {
+    state = state * 6364136223846793005ULL + 1442695040888963407ULL;
+    return lo + static_cast<int>((state >> 33) % static_cast<uint64_t>(hi - lo + 1));
+  };
+  const std::pair<int, int> sizes[] = {{1, 1}, {5, 300}, {64, 64}, {300, 200}};
+  for (const auto& [w, h] : sizes) {
+    std::vector<uint8_t> pixels(static_cast<size_t>(w) * static_cast<size_t>(h) * 3);
+    for (auto& p : pixels) p = static_cast<uint8_t>(next(0, 255));
+    const PageImage page{w, h, 3, 3, pixels.data(), static_cast<std::ptrdiff_t>(w) * 3};
+    for (int i = 0; i < 60; ++i) {
+      ModuleAnswer a;
+      const int x0 = next(-400, 400), y0 = next(-400, 400), x1 = x0 + next(0, 700),
+                y1 = y0 + next(0, 700);
+      a.corners = {Vec2{static_cast<double>(x0), static_cast<double>(y0)},
+                   Vec2{static_cast<double>(x1), static_cast<double>(y0 + next(-5, 5))},
+                   Vec2{static_cast<double>(x1), static_cast<double>(y1)},
+                   Vec2{static_cast<double>(x0), static_cast<double>(y1)}};
+      a.angle = next(-45, 45);
+      a.confidence = next(0, 1) == 0 ? 0 : 255;
+      const Refinement r = RefineOutline(page, a);
+      for (const Vec2& c : r.outline) {
+        EXPECT_TRUE(std::isfinite(c.x) && std::isfinite(c.y));
+      }
+      EXPECT_TRUE(std::isfinite(r.angle));
+      if (a.confidence == 0) {
+        EXPECT_EQ(r.status, RefineStatus::kNoPhoto);
+      }
+    }
+  }
+}
+
+}  // namespace
+}  // namespace Refine

@@ -231,6 +231,9 @@ int main(int argc, char** argv) {
   try {
     Accuracy::StartImageLibrary(argv[0]);
     return Run(s);
+  } catch (const CLI::Error& e) {
+    std::fprintf(stderr, "fringe-accuracy: %s\n", e.what());
+    return kExitUsage;
   } catch (const std::exception& e) {
     std::fprintf(stderr, "fringe-accuracy: %s\n", e.what());
     return kExitFailure;
