@@ -81,22 +81,29 @@ AlignedProfile AlignProfiles(const ProfileStrip& strip, double maxSlope) {
   for (int g = 0; g <= groupCount; ++g)
     groupFirst[static_cast<size_t>(g)] = g * strip.lines / groupCount;
   std::vector<std::vector<double>> groups(static_cast<size_t>(groupCount));
+  std::vector<double> sums;
+  std::vector<int> counts;
   std::vector<double> groupT(static_cast<size_t>(groupCount), 0.0);
   for (int g = 0; g < groupCount; ++g) {
     const int first = groupFirst[static_cast<size_t>(g)];
     const int last = groupFirst[static_cast<size_t>(g) + 1];
     auto& mean = groups[static_cast<size_t>(g)];
     mean.assign(static_cast<size_t>(width), kNaN);
-    for (int k = 0; k < width; ++k) {
-      double sum = 0.0;
-      int n = 0;
-      for (int line = first; line < last; ++line) {
+    // Line by line along the strip's rows; each column still sums its lines in order.
+    sums.assign(static_cast<size_t>(width), 0.0);
+    counts.assign(static_cast<size_t>(width), 0);
+    for (int line = first; line < last; ++line) {
+      for (int k = 0; k < width; ++k) {
         const double v = strip.At(line, k);
         if (std::isnan(v)) continue;
-        sum += v;
-        ++n;
+        sums[static_cast<size_t>(k)] += v;
+        ++counts[static_cast<size_t>(k)];
       }
-      if (2 * n >= last - first && n > 0) mean[static_cast<size_t>(k)] = sum / n;
+    }
+    for (int k = 0; k < width; ++k) {
+      const int n = counts[static_cast<size_t>(k)];
+      if (2 * n >= last - first && n > 0)
+        mean[static_cast<size_t>(k)] = sums[static_cast<size_t>(k)] / n;
     }
     groupT[static_cast<size_t>(g)] =
         0.5 * (strip.t[static_cast<size_t>(first)] + strip.t[static_cast<size_t>(last - 1)]);
@@ -136,28 +143,33 @@ AlignedProfile AlignProfiles(const ProfileStrip& strip, double maxSlope) {
   // Roughness of each group: the mean |difference| between its neighbouring
   // lines, each line lined up with the structures.
   std::vector<std::vector<double>> groupRough(static_cast<size_t>(groupCount));
+  std::vector<double> previous;
   for (int g = 0; g < groupCount; ++g) {
     const int first = groupFirst[static_cast<size_t>(g)];
     const int last = groupFirst[static_cast<size_t>(g) + 1];
     auto& rough = groupRough[static_cast<size_t>(g)];
     rough.assign(static_cast<size_t>(width), kNaN);
     if (last - first < 2) continue;
-    for (int k = 0; k < width; ++k) {
-      double sum = 0.0;
-      int n = 0;
-      double previous = kNaN;
-      for (int line = first; line < last; ++line) {
-        const double at =
-            k + bestSlope * (strip.t[static_cast<size_t>(line)] - out.tCentre) / strip.sStep;
-        const double v = InterpolateLine(strip, line, at);
-        if (!std::isnan(v) && !std::isnan(previous)) {
-          sum += std::abs(v - previous);
-          ++n;
+    sums.assign(static_cast<size_t>(width), 0.0);
+    counts.assign(static_cast<size_t>(width), 0);
+    previous.assign(static_cast<size_t>(width), kNaN);
+    for (int line = first; line < last; ++line) {
+      const double lineShift =
+          bestSlope * (strip.t[static_cast<size_t>(line)] - out.tCentre) / strip.sStep;
+      for (int k = 0; k < width; ++k) {
+        const double v = InterpolateLine(strip, line, k + lineShift);
+        double& before = previous[static_cast<size_t>(k)];
+        if (!std::isnan(v) && !std::isnan(before)) {
+          sums[static_cast<size_t>(k)] += std::abs(v - before);
+          ++counts[static_cast<size_t>(k)];
         }
-        previous = v;
+        before = v;
       }
+    }
+    for (int k = 0; k < width; ++k) {
+      const int n = counts[static_cast<size_t>(k)];
       // For two values with independent noise sigma, E|difference| = 1.128 sigma.
-      if (n > 0) rough[static_cast<size_t>(k)] = sum / n / 1.128;
+      if (n > 0) rough[static_cast<size_t>(k)] = sums[static_cast<size_t>(k)] / n / 1.128;
     }
   }
 
