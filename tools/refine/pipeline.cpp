@@ -2,6 +2,9 @@
 #include "refine/pipeline.h"
 
 #include <chrono>
+#include <optional>
+
+#include "refine/lid_seed.h"
 
 namespace Refine {
 namespace {
@@ -23,6 +26,30 @@ int Rank(const Refinement& r) {
       return 0;
   }
   return 0;
+}
+
+// Refinement started from the region that departs from the lid, when that
+// region holds the module's box: its sides are then where the photo's are.
+std::optional<Refinement> RefineFromLidSeed(const PageImage& page, const ModuleAnswer& module,
+                                            const RefineOptions& options) {
+  const LidEstimate lid = options.lid ? *options.lid : EstimateLid(page);
+  const SampleArea area = options.area.value_or(SampleArea{
+      0.0, 0.0, static_cast<double>(page.width - 1), static_cast<double>(page.height - 1)});
+  const std::optional<LidSeed> seed = SeedFromLid(page, lid, area);
+  if (!seed) return std::nullopt;
+  const Vec2 centre = (module.corners[0] + module.corners[2]) * 0.5;
+  for (int k = 0; k < 4; ++k) {
+    const Vec2 a = seed->corners[k], b = seed->corners[(k + 1) % 4];
+    if (Cross(b - a, centre - a) < 0.0) return std::nullopt;
+  }
+  ModuleAnswer start;
+  start.corners = seed->corners;
+  start.angle = seed->angle;
+  start.confidence = 255;
+  Refinement out = RefineOutline(page, start, options);
+  if (out.status == RefineStatus::kRefined)
+    out.reason = "every side found again around the photo's extent on the lid";
+  return out;
 }
 
 }  // namespace
@@ -75,6 +102,12 @@ PipelineResult RefineDetection(Detector& detector, const PageImage& page, const 
     if (result.prepared && result.raw.FoundPhoto() && Rank(result.refined) < 2) {
       Refinement other = RefineOutline(page, result.raw, refineOptions);
       if (Rank(other) > Rank(result.refined)) result.refined = std::move(other);
+    }
+    // Some sides not found: the module's box may hold only part of the photo.
+    if (chosen.FoundPhoto() && Rank(result.refined) < 3) {
+      if (auto other = RefineFromLidSeed(page, chosen, refineOptions);
+          other && Rank(*other) > Rank(result.refined))
+        result.refined = std::move(*other);
     }
   }
   result.refineSeconds = Since(start);
