@@ -4,6 +4,7 @@
 
 #include <gtest/gtest.h>
 
+#include <algorithm>
 #include <cmath>
 #include <numbers>
 #include <vector>
@@ -106,6 +107,24 @@ TEST(SeedFromLid, NothingOnABlankPageOrOutsideTheArea) {
   EXPECT_FALSE(SeedFromLid(page.View(), lid, SampleArea{0.0, 0.0, 120.0, 699.0}));
   // No lid measured: no seed.
   EXPECT_FALSE(SeedFromLid(page.View(), LidEstimate{}, WholePage(page)));
+}
+
+TEST(DepartsOutside, OnlyAnOutlineInsideALargerRegionHasPhotoJustOutside) {
+  const Quad truth = TurnedRectangle({430, 340}, 520, 360, 4.0);
+  const GrayPage page = Paint(&truth);
+  const LidEstimate lid = EstimateLid(page.View());
+  const SampleArea area = WholePage(page);
+  EXPECT_FALSE(DepartsOutside(page.View(), lid, area, truth));
+  // The photo's right two thirds: its left side has photo outside it.
+  const Quad part{truth[0] + (truth[1] - truth[0]) * 0.33, truth[1], truth[2],
+                  truth[3] + (truth[2] - truth[3]) * 0.33};
+  EXPECT_TRUE(DepartsOutside(page.View(), lid, area, part));
+  // Outside the sample area nothing is read, so nothing departs: an area
+  // starting just left of the part's left side.
+  const double left = std::min(part[0].x, part[3].x) - 2.0;
+  EXPECT_FALSE(DepartsOutside(page.View(), lid, SampleArea{left, 0.0, 899.0, 699.0}, part));
+  const GrayPage blank = Paint(nullptr);
+  EXPECT_FALSE(DepartsOutside(blank.View(), EstimateLid(blank.View()), area, part));
 }
 
 }  // namespace

@@ -30,6 +30,13 @@ constexpr double kBlocksAlong = 400.0;
 // A region smaller than this share of the area is dust or a stain, not a photo.
 constexpr double kMinShare = 0.01;
 
+// How far a mean of size x size pixels may stray from the lid's surface and
+// still be lid: its noise shrinks with the square root of its pixel count,
+// the lid's own unevenness about the fitted surface stays.
+double DepartureThreshold(const LidEstimate& lid, int size) {
+  return std::max(3.0, 4.0 * lid.noise / size + 3.0 * lid.residual);
+}
+
 BlockGrid MarkDepartures(const PageImage& page, const LidEstimate& lid, const SampleArea& area) {
   BlockGrid grid;
   const double spanX = area.right - area.left + 1.0;
@@ -42,21 +49,28 @@ BlockGrid MarkDepartures(const PageImage& page, const LidEstimate& lid, const Sa
   if (grid.columns < 3 || grid.rows < 3) return grid;
   grid.cells.assign(static_cast<size_t>(grid.columns) * static_cast<size_t>(grid.rows), 0);
 
-  const GraySampler sampler(page);
-  // A block mean's noise shrinks with the square root of its pixel count;
-  // the lid's own unevenness about its fitted surface stays.
-  const double threshold = std::max(3.0, 4.0 * lid.noise / grid.size + 3.0 * lid.residual);
-  const double pixels = static_cast<double>(grid.size) * grid.size;
+  const double threshold = DepartureThreshold(lid, grid.size);
+  // Whole-number sums of the colour bytes, a block row at a time.
+  std::vector<uint32_t> sums(static_cast<size_t>(grid.columns));
+  const double scale = 1.0 / (static_cast<double>(grid.size) * grid.size * page.channels);
   for (int r = 0; r < grid.rows; ++r) {
     const auto y0 = static_cast<int32_t>(grid.top) + r * grid.size;
+    std::fill(sums.begin(), sums.end(), 0u);
+    for (int32_t y = y0; y < y0 + grid.size; ++y) {
+      const uint8_t* row = page.pixels + static_cast<std::ptrdiff_t>(y) * page.rowBytes +
+                           static_cast<std::ptrdiff_t>(grid.left) * page.pixelBytes;
+      for (int c = 0; c < grid.columns; ++c) {
+        uint32_t sum = 0;
+        for (int i = 0; i < grid.size; ++i, row += page.pixelBytes)
+          for (int ch = 0; ch < page.channels; ++ch) sum += row[ch];
+        sums[static_cast<size_t>(c)] += sum;
+      }
+    }
+    const double v = (y0 + 0.5 * grid.size) / page.height;
     for (int c = 0; c < grid.columns; ++c) {
-      const auto x0 = static_cast<int32_t>(grid.left) + c * grid.size;
-      double sum = 0.0;
-      for (int32_t y = y0; y < y0 + grid.size; ++y)
-        for (int32_t x = x0; x < x0 + grid.size; ++x) sum += sampler.Pixel(x, y);
-      const double u = (x0 + 0.5 * grid.size) / page.width;
-      const double v = (y0 + 0.5 * grid.size) / page.height;
-      if (std::abs(sum / pixels - LidAt(lid, u, v)) > threshold) grid.At(c, r) = 1;
+      const double u = (grid.left + (c + 0.5) * grid.size) / page.width;
+      if (std::abs(sums[static_cast<size_t>(c)] * scale - LidAt(lid, u, v)) > threshold)
+        grid.At(c, r) = 1;
     }
   }
   return grid;
@@ -176,6 +190,41 @@ std::optional<Quad> MinimumAreaRectangle(std::vector<Vec2> points) {
     best = Quad{u * minU + v * minV, u * maxU + v * minV, u * maxU + v * maxV, u * minU + v * maxV};
   }
   return best;
+}
+
+bool DepartsOutside(const PageImage& page, const LidEstimate& lid, const SampleArea& area,
+                    const Quad& outline) {
+  if (!CheckPageImage(page).empty() || !(lid.level > 0.0)) return false;
+  const GraySampler sampler(page);
+  constexpr int kSize = 4;  // means of 4 x 4 pixels
+  constexpr int kPoints = 16;
+  const double threshold = DepartureThreshold(lid, kSize);
+  for (int k = 0; k < 4; ++k) {
+    const Vec2 a = outline[k], b = outline[(k + 1) % 4];
+    const double length = Distance(a, b);
+    if (!(length > 0.0)) continue;
+    // Outward: the side turned a quarter anticlockwise on screen.
+    const Vec2 along = (b - a) * (1.0 / length);
+    const Vec2 outward{along.y, -along.x};
+    const double reach = std::clamp(0.05 * length, 16.0, 64.0);
+    int seen = 0, departing = 0;
+    for (int i = 0; i < kPoints; ++i) {
+      const Vec2 p = a + (b - a) * ((i + 0.5) / kPoints) + outward * reach;
+      const double left = std::floor(p.x) - kSize / 2 + 1, top = std::floor(p.y) - kSize / 2 + 1;
+      if (!(left >= area.left && top >= area.top && left + kSize - 1 <= area.right &&
+            top + kSize - 1 <= area.bottom))
+        continue;
+      double sum = 0.0;
+      for (int y = 0; y < kSize; ++y)
+        for (int x = 0; x < kSize; ++x)
+          sum += sampler.Pixel(static_cast<int32_t>(left) + x, static_cast<int32_t>(top) + y);
+      ++seen;
+      const double mean = sum / (kSize * kSize);
+      if (std::abs(mean - LidAt(lid, p.x / page.width, p.y / page.height)) > threshold) ++departing;
+    }
+    if (seen >= kPoints / 2 && 2 * departing > seen) return true;
+  }
+  return false;
 }
 
 std::optional<LidSeed> SeedFromLid(const PageImage& page, const LidEstimate& lid,

@@ -24,6 +24,11 @@ struct LidSeed {
 std::optional<LidSeed> SeedFromLid(const PageImage& page, const LidEstimate& lid,
                                    const SampleArea& area);
 
+// True when, just outside some side of the outline, the page mostly departs
+// from the lid: the outline may lie inside a larger region. A few dozen reads.
+bool DepartsOutside(const PageImage& page, const LidEstimate& lid, const SampleArea& area,
+                    const Quad& outline);
+
 // The smallest-area rectangle around a set of points (rotating the frame to
 // each edge of their convex hull), clockwise from its top-left corner.
 // Nothing for fewer than three points not on one line.

@@ -30,13 +30,24 @@ int Rank(const Refinement& r) {
 
 // Refinement started from the region that departs from the lid, when that
 // region holds the module's box: its sides are then where the photo's are.
+// Returns it only when it does better than `current`.
 std::optional<Refinement> RefineFromLidSeed(const PageImage& page, const ModuleAnswer& module,
-                                            const RefineOptions& options) {
+                                            const RefineOptions& options,
+                                            const Refinement& current) {
+  const bool complete = Rank(current) >= 3;
   const LidEstimate lid = options.lid ? *options.lid : EstimateLid(page);
   const SampleArea area = options.area.value_or(SampleArea{
       0.0, 0.0, static_cast<double>(page.width - 1), static_cast<double>(page.height - 1)});
+  // A complete outline is looked at again only when the page just outside it
+  // is not lid; cheap to ask first, as the seed reads the whole page.
+  if (complete && !DepartsOutside(page, lid, area, current.outline)) return std::nullopt;
   const std::optional<LidSeed> seed = SeedFromLid(page, lid, area);
   if (!seed) return std::nullopt;
+  // A complete outline well inside a solid region was taken from inner edges.
+  constexpr double kGrowth = 1.15;
+  if (complete &&
+      !(seed->coverage > 0.9 && QuadArea(seed->corners) > kGrowth * QuadArea(current.outline)))
+    return std::nullopt;
   const Vec2 centre = (module.corners[0] + module.corners[2]) * 0.5;
   for (int k = 0; k < 4; ++k) {
     const Vec2 a = seed->corners[k], b = seed->corners[(k + 1) % 4];
@@ -47,6 +58,10 @@ std::optional<Refinement> RefineFromLidSeed(const PageImage& page, const ModuleA
   start.angle = seed->angle;
   start.confidence = 255;
   Refinement out = RefineOutline(page, start, options);
+  if (Rank(out) < Rank(current)) return std::nullopt;
+  if (complete && !(QuadArea(out.outline) > kGrowth * QuadArea(current.outline)))
+    return std::nullopt;
+  if (Rank(out) == Rank(current) && !complete) return std::nullopt;
   if (out.status == RefineStatus::kRefined)
     out.reason = "every side found again around the photo's extent on the lid";
   return out;
@@ -103,11 +118,13 @@ PipelineResult RefineDetection(Detector& detector, const PageImage& page, const 
       Refinement other = RefineOutline(page, result.raw, refineOptions);
       if (Rank(other) > Rank(result.refined)) result.refined = std::move(other);
     }
-    // Some sides not found: the module's box may hold only part of the photo.
-    if (chosen.FoundPhoto() && Rank(result.refined) < 3) {
-      if (auto other = RefineFromLidSeed(page, chosen, refineOptions);
-          other && Rank(*other) > Rank(result.refined))
+    // The module's box may hold only part of the photo: some sides then stay
+    // unfound, or are found on the photo's own inner edges, well inside the
+    // region that departs from the lid.
+    if (chosen.FoundPhoto()) {
+      if (auto other = RefineFromLidSeed(page, chosen, refineOptions, result.refined)) {
         result.refined = std::move(*other);
+      }
     }
   }
   result.refineSeconds = Since(start);
