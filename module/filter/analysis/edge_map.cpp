@@ -104,8 +104,10 @@ class RowTerms {
            smooth_[1] && smooth_[2];
   }
 
-  void Make(int32_t row, const uint8_t* bytes, int32_t step, int16_t channels, int32_t count) {
-    MakeEdgeTerms({bytes, step, channels, count, sums_.get(), Difference(row), Smooth(row)});
+  // The job that makes the terms of source row `row` from its bytes.
+  EdgeTermsJob Job(int32_t row, const uint8_t* bytes, int32_t step, int16_t channels,
+                   int32_t count) {
+    return {bytes, step, channels, count, sums_.get(), Difference(row), Smooth(row)};
   }
 
   int16_t* Difference(int32_t row) { return difference_[row % 3].get(); }
@@ -139,17 +141,15 @@ bool RowKernelMap(const FrameView& frame, AnalysisHost& host, const MapExtent& e
   const auto source = [&](int32_t row) {
     return PixelAt(frame.outData, 0, row, frame.outRowBytes, step);
   };
-  terms.Make(0, source(0), step, e.channels, count);
-  terms.Make(1, source(1), step, e.channels, count);
+  MakeEdgeTerms(terms.Job(0, source(0), step, e.channels, count));
+  MakeEdgeTerms(terms.Job(1, source(1), step, e.channels, count));
   for (int32_t y = 1; y <= e.height - 4; ++y) {
     if (CancelRequested(host)) return true;
     TakeProgressStep(progress, host);
-    terms.Make(y + 1, source(y + 1), step, e.channels, count);
     EdgeTestJob job{};
-    for (int32_t k = 0; k < 3; ++k) {
-      job.difference[k] = terms.Difference(y - 1 + k);
-      job.smooth[k] = terms.Smooth(y - 1 + k);
-    }
+    job.difference[0] = terms.Difference(y - 1);
+    job.difference[1] = terms.Difference(y);
+    job.smooth = terms.Smooth(y - 1);
     job.first = 1;
     job.last = e.width - 6;
     job.threshold = e.threshold;
@@ -157,7 +157,7 @@ bool RowKernelMap(const FrameView& frame, AnalysisHost& host, const MapExtent& e
     job.target = PixelAt(frame.inData, 0, y, frame.inRowBytes, step);
     job.step = step;
     job.map = terms.Map();
-    TestEdgeRow(job);
+    MapEdgeRow(terms.Job(y + 1, source(y + 1), step, e.channels, count), job);
   }
   return true;
 }

@@ -44,17 +44,10 @@ FRINGE_KERNEL_BODY void TermsFromSums(const Sum* __restrict p, int16_t* __restri
   }
 }
 
-FRINGE_KERNEL_BODY void MakeTerms(const EdgeTermsJob& job) {
-  if (job.step == 1 && job.channels == 1) {
-    // One byte per pixel: the bytes are the sums.
-    TermsFromSums(job.row, job.difference, job.smooth, job.count);
-    return;
-  }
+// The pixel sums of a row of more than one byte per pixel.
+FRINGE_KERNEL_BODY void SumRow(const EdgeTermsJob& job) {
   const int32_t layout = job.step * 10 + job.channels;
   switch (layout) {
-    case 11:
-      SumPixels<1, 1>(job.row, job.sums, job.count);
-      break;
     case 21:
       SumPixels<2, 1>(job.row, job.sums, job.count);
       break;
@@ -77,6 +70,15 @@ FRINGE_KERNEL_BODY void MakeTerms(const EdgeTermsJob& job) {
       SumPixelsAnyLayout(job.row, job.step, job.channels, job.sums, job.count);
       break;
   }
+}
+
+FRINGE_KERNEL_BODY void MakeTerms(const EdgeTermsJob& job) {
+  if (job.step == 1 && job.channels == 1) {
+    // One byte per pixel: the bytes are the sums.
+    TermsFromSums(job.row, job.difference, job.smooth, job.count);
+    return;
+  }
+  SumRow(job);
   TermsFromSums(job.sums, job.difference, job.smooth, job.count);
 }
 
@@ -107,17 +109,35 @@ struct WideTest {
   }
 };
 
-template <typename Test>
-FRINGE_KERNEL_BODY void TestPixels(const EdgeTestJob& job, Test test, uint8_t* __restrict out) {
+// The terms of the row below made and used at once: one pass over the
+// pixels reads the row below's sums and the older rows' terms, and writes
+// the row below's terms and the map bytes.
+template <typename Sum, typename Test>
+FRINGE_KERNEL_BODY void TermsAndTest(const Sum* __restrict p, const EdgeTermsJob& below,
+                                     const EdgeTestJob& job, Test test, uint8_t* __restrict out) {
+  int16_t* __restrict d2 = below.difference;
+  int16_t* __restrict s2 = below.smooth;
   const int16_t* __restrict d0 = job.difference[0];
   const int16_t* __restrict d1 = job.difference[1];
-  const int16_t* __restrict d2 = job.difference[2];
-  const int16_t* __restrict s0 = job.smooth[0];
-  const int16_t* __restrict s2 = job.smooth[2];
+  const int16_t* __restrict s0 = job.smooth;
   for (int32_t x = job.first; x <= job.last; ++x) {
-    const auto gx = static_cast<int16_t>(d0[x] + 2 * d1[x] + d2[x]);
-    const auto gy = static_cast<int16_t>(s2[x] - s0[x]);
+    const auto difference = static_cast<int16_t>(p[x + 1] - p[x - 1]);
+    const auto smooth = static_cast<int16_t>(p[x - 1] + 2 * p[x] + p[x + 1]);
+    d2[x] = difference;
+    s2[x] = smooth;
+    const auto gx = static_cast<int16_t>(d0[x] + 2 * d1[x] + difference);
+    const auto gy = static_cast<int16_t>(smooth - s0[x]);
     out[x] = test(gx, gy);
+  }
+}
+
+template <typename Test>
+FRINGE_KERNEL_BODY void TermsAndTestAnySource(const EdgeTermsJob& below, const EdgeTestJob& job,
+                                              Test test, uint8_t* out) {
+  if (below.step == 1 && below.channels == 1) {
+    TermsAndTest(below.row, below, job, test, out);
+  } else {
+    TermsAndTest(below.sums, below, job, test, out);
   }
 }
 
@@ -140,14 +160,16 @@ FRINGE_KERNEL_BODY void SpreadMapAnyStep(const uint8_t* map, uint8_t* target, in
   for (int32_t x = first; x <= last; ++x) target[static_cast<std::ptrdiff_t>(x) * step] = map[x];
 }
 
-FRINGE_KERNEL_BODY void TestRow(const EdgeTestJob& job) {
+FRINGE_KERNEL_BODY void MapRow(const EdgeTermsJob& below, const EdgeTestJob& job) {
+  if (below.step != 1 || below.channels != 1) SumRow(below);
   uint8_t* out = job.step == 1 ? job.target : job.map;
   if (job.threshold >= -kSmallThreshold && job.threshold <= kSmallThreshold) {
     const int32_t t = job.threshold < 0 ? -job.threshold : job.threshold;
-    TestPixels(job, SmallTest{static_cast<int16_t>(3 * t + 1), static_cast<int16_t>(job.limit)},
-               out);
+    TermsAndTestAnySource(
+        below, job, SmallTest{static_cast<int16_t>(3 * t + 1), static_cast<int16_t>(job.limit)},
+        out);
   } else {
-    TestPixels(job, WideTest{job.limit}, out);
+    TermsAndTestAnySource(below, job, WideTest{job.limit}, out);
   }
   switch (job.step) {
     case 1:
@@ -170,15 +192,15 @@ FRINGE_KERNEL_BODY void TestRow(const EdgeTestJob& job) {
 void MakeTermsPortable(const EdgeTermsJob& job) {
   MakeTerms(job);
 }
-void TestRowPortable(const EdgeTestJob& job) {
-  TestRow(job);
+void MapRowPortable(const EdgeTermsJob& below, const EdgeTestJob& job) {
+  MapRow(below, job);
 }
 #if FRINGE_WIDE_KERNELS
 FRINGE_WIDE_TARGET void MakeTermsWide(const EdgeTermsJob& job) {
   MakeTerms(job);
 }
-FRINGE_WIDE_TARGET void TestRowWide(const EdgeTestJob& job) {
-  TestRow(job);
+FRINGE_WIDE_TARGET void MapRowWide(const EdgeTermsJob& below, const EdgeTestJob& job) {
+  MapRow(below, job);
 }
 #endif
 
@@ -194,14 +216,14 @@ void MakeEdgeTerms(const EdgeTermsJob& job) {
   MakeTermsPortable(job);
 }
 
-void TestEdgeRow(const EdgeTestJob& job) {
+void MapEdgeRow(const EdgeTermsJob& below, const EdgeTestJob& job) {
 #if FRINGE_WIDE_KERNELS
   if (UseWideKernels()) {
-    TestRowWide(job);
+    MapRowWide(below, job);
     return;
   }
 #endif
-  TestRowPortable(job);
+  MapRowPortable(below, job);
 }
 
 }  // namespace Project

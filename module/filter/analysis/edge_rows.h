@@ -25,13 +25,14 @@ struct EdgeTermsJob {
   int16_t* smooth;
 };
 
-// One map row, pixels first ... last, from the terms of the source rows
-// above (0), at (1) and below (2) it: 0 (an edge) where gx^2 + gy^2 >
-// 9 threshold^2, else 255, into the first byte of each target pixel. The
-// other bytes of the target pixels keep their values.
+// One map row, pixels first ... last (inside 1 ... count - 2 of the row
+// below's job), from the terms of the source rows above (0) and at (1) it
+// and of the row below, which are made on the way: 0 (an edge) where
+// gx^2 + gy^2 > 9 threshold^2, else 255, into the first byte of each target
+// pixel. The other bytes of the target pixels keep their values.
 struct EdgeTestJob {
-  const int16_t* difference[3];
-  const int16_t* smooth[3];  // [1] is not read
+  const int16_t* difference[2];
+  const int16_t* smooth;  // of the row above
   int32_t first;
   int32_t last;
   int32_t threshold;
@@ -42,6 +43,6 @@ struct EdgeTestJob {
 };
 
 void MakeEdgeTerms(const EdgeTermsJob& job);
-void TestEdgeRow(const EdgeTestJob& job);
+void MapEdgeRow(const EdgeTermsJob& below, const EdgeTestJob& job);
 
 }  // namespace Project
