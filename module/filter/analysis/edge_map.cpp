@@ -121,6 +121,14 @@ class RowTerms {
   std::unique_ptr<int16_t[]> smooth_[3];
 };
 
+// Asks for a source row two rows ahead of its use. Measured: it pays for
+// one-byte pixels, whose rows take little work against their fetch; rows of
+// wider pixels are left to the processor's own prefetching. A hint only.
+void PrefetchRow(const uint8_t* row, int32_t bytes) {
+  constexpr int32_t kCacheLine = 64;
+  for (int32_t i = 0; i < bytes; i += kCacheLine) __builtin_prefetch(row + i);
+}
+
 // The whole map through separable row terms. False (before any host call)
 // when the layout does not suit the row kernels or no workspace can be had.
 bool RowKernelMap(const FrameView& frame, AnalysisHost& host, const MapExtent& e,
@@ -146,6 +154,7 @@ bool RowKernelMap(const FrameView& frame, AnalysisHost& host, const MapExtent& e
   for (int32_t y = 1; y <= e.height - 4; ++y) {
     if (CancelRequested(host)) return true;
     TakeProgressStep(progress, host);
+    if (step == 1 && y + 3 <= e.height - 3) PrefetchRow(source(y + 3), count);
     EdgeTestJob job{};
     job.difference[0] = terms.Difference(y - 1);
     job.difference[1] = terms.Difference(y);
