@@ -25,6 +25,7 @@
 #include "filter/analysis/driver.h"
 #include "filter/analysis/edge_map.h"
 #include "filter/analysis/edge_points.h"
+#include "filter/analysis/kernel_choice.h"
 #include "filter/analysis/profiles.h"
 #include "filter/analysis/reference/literal_stages.h"
 #if FRINGE_BENCH_CONTOURS
@@ -182,6 +183,15 @@ void Chain(benchmark::State& state, BenchPage& page) {
   CountPixels(state, page);
 }
 
+// The whole chain with the portable kernels, where the processor would run
+// the AVX2 ones: what the wider vectors buy.
+void PortableChain(benchmark::State& state, BenchPage& page) {
+  const bool wide = UseWideKernels();
+  ForcePortableKernels(true);
+  Chain(state, page);
+  ForcePortableKernels(!wide);
+}
+
 // The whole chain through the literal stages.
 void LiteralChain(benchmark::State& state, BenchPage& page) {
   QuietHost host;
@@ -254,7 +264,7 @@ class FloorRatioReporter : public benchmark::ConsoleReporter {
     }
     std::printf(
         "\nCPU time per frame as a multiple of the floors (each a single read of the frame):\n");
-    std::printf("  %-16s %-18s %10s %12s %12s %9s\n", "page", "stage", "ms", "x floor",
+    std::printf("  %-16s %-20s %10s %12s %12s %9s\n", "page", "stage", "ms", "x floor",
                 "x bandwidth", "of chain");
     for (const std::string& page : pages) {
       const auto& stage = times[page];
@@ -263,7 +273,7 @@ class FloorRatioReporter : public benchmark::ConsoleReporter {
       const double chain = Find(stage, "RunAnalysis");
       for (const Row& row : rows_) {
         if (row.page != page) continue;
-        std::printf("  %-16s %-18s %10.3f %12s %12s %9s\n", page.c_str(), row.stage.c_str(),
+        std::printf("  %-16s %-20s %10.3f %12s %12s %9s\n", page.c_str(), row.stage.c_str(),
                     row.time, Ratio(row.time, floor).c_str(), Ratio(row.time, bandwidth).c_str(),
                     IsStage(row.stage) ? Share(row.time, chain).c_str() : "");
       }
@@ -328,6 +338,7 @@ void Register() {
     {"EstimateAngle", Angle},
     {"BoxFit", Box},
     {"RunAnalysis", Chain},
+    {"RunAnalysisPortable", PortableChain},
     {"LiteralRunAnalysis", LiteralChain},
 #if FRINGE_BENCH_CONTOURS
     {"OpenCVContours", Contours},
@@ -345,7 +356,23 @@ void Register() {
 
 }  // namespace
 
+// --portable_kernels runs every benchmark with the portable kernels.
+bool TakePortableFlag(int& argc, char** argv) {
+  bool found = false;
+  int kept = 1;
+  for (int i = 1; i < argc; ++i) {
+    if (std::string(argv[i]) == "--portable_kernels") {
+      found = true;
+    } else {
+      argv[kept++] = argv[i];
+    }
+  }
+  argc = kept;
+  return found;
+}
+
 int main(int argc, char** argv) {
+  if (TakePortableFlag(argc, argv)) ForcePortableKernels(true);
   benchmark::Initialize(&argc, argv);
   if (benchmark::ReportUnrecognizedArguments(argc, argv)) return 1;
   Register();
