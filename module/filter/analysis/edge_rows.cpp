@@ -1,6 +1,8 @@
 // The edge map's row kernels, each in a portable and an AVX2 build of the
 // same loops. Loops for the common pixel layouts have the layout fixed at
 // compile time, so that they become vector code; the rest run generic loops.
+// The one exception: the AVX2 build writes the map into three-byte pixels
+// with the platform's byte shuffle, which the compiler does not find.
 #include "filter/analysis/edge_rows.h"
 
 #include <algorithm>
@@ -8,6 +10,7 @@
 #include <cstdint>
 
 #include "filter/analysis/kernel_choice.h"
+#include "platform/cpu/pixel_shuffle.h"
 
 namespace Project {
 namespace {
@@ -160,6 +163,8 @@ FRINGE_KERNEL_BODY void SpreadMapAnyStep(const uint8_t* map, uint8_t* target, in
   for (int32_t x = first; x <= last; ++x) target[static_cast<std::ptrdiff_t>(x) * step] = map[x];
 }
 
+// Wide: the AVX2 build, which may call the platform's AVX2 shuffles.
+template <bool Wide>
 FRINGE_KERNEL_BODY void MapRow(const EdgeTermsJob& below, const EdgeTestJob& job) {
   if (below.step != 1 || below.channels != 1) SumRow(below);
   uint8_t* out = job.step == 1 ? job.target : job.map;
@@ -178,7 +183,12 @@ FRINGE_KERNEL_BODY void MapRow(const EdgeTermsJob& below, const EdgeTestJob& job
       SpreadMap<2>(job.map, job.target, job.first, job.last);
       break;
     case 3:
-      SpreadMap<3>(job.map, job.target, job.first, job.last);
+      if constexpr (Wide) {
+        Vireo::Platform::SpreadIntoThreeBytePixelsAvx2(
+            job.map + job.first, job.target + 3 * job.first, job.last - job.first + 1);
+      } else {
+        SpreadMap<3>(job.map, job.target, job.first, job.last);
+      }
       break;
     case 4:
       SpreadMap<4>(job.map, job.target, job.first, job.last);
@@ -193,14 +203,14 @@ void MakeTermsPortable(const EdgeTermsJob& job) {
   MakeTerms(job);
 }
 void MapRowPortable(const EdgeTermsJob& below, const EdgeTestJob& job) {
-  MapRow(below, job);
+  MapRow<false>(below, job);
 }
 #if FRINGE_WIDE_KERNELS
 FRINGE_WIDE_TARGET void MakeTermsWide(const EdgeTermsJob& job) {
   MakeTerms(job);
 }
 FRINGE_WIDE_TARGET void MapRowWide(const EdgeTermsJob& below, const EdgeTestJob& job) {
-  MapRow(below, job);
+  MapRow<true>(below, job);
 }
 #endif
 
