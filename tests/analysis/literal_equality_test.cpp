@@ -1,8 +1,10 @@
 // The module's stages against their literal form on randomised frames and on
 // the golden pages: the same bits in every list, the same bytes in both
 // buffers, the same host calls in the same order, cancels and refused
-// memory included. Every case prints its seed; FRINGE_EQUALITY_SEED=<seed>
-// replays one case and FRINGE_EQUALITY_CASES=<n> runs more of them.
+// memory included. Every test runs twice: with the row kernels this
+// processor picks, and with the portable ones forced. Every case prints its
+// seed; FRINGE_EQUALITY_SEED=<seed> replays one case and
+// FRINGE_EQUALITY_CASES=<n> runs more of them.
 #include <gtest/gtest.h>
 
 #include <algorithm>
@@ -20,9 +22,11 @@
 #include "filter/analysis/edge_map.h"
 #include "filter/analysis/edge_points.h"
 #include "filter/analysis/frame_size.h"
+#include "filter/analysis/kernel_choice.h"
 #include "filter/analysis/profiles.h"
 #include "filter/analysis/reference/literal_stages.h"
 #include "golden_pages.h"
+#include "platform/cpu/cpu_features.h"
 #include "random_frames.h"
 #include "recording_host.h"
 
@@ -46,6 +50,31 @@ struct MemorySwitches {
     RefuseWorkspaces(false);
   }
 };
+
+// The kernel build under test: false for the one this processor picks, true
+// for the portable one.
+class LiteralEqualityTest : public ::testing::TestWithParam<bool> {
+ protected:
+  void SetUp() override { ForcePortableKernels(GetParam()); }
+  void TearDown() override { ForcePortableKernels(false); }
+};
+
+INSTANTIATE_TEST_SUITE_P(Kernels, LiteralEqualityTest, ::testing::Values(false, true),
+                         [](const ::testing::TestParamInfo<bool>& kernels) {
+                           return kernels.param ? "Portable" : "Chosen";
+                         });
+
+// The chosen run above covers the AVX2 kernels only where they are chosen.
+TEST(KernelChoiceTest, AvxKernelsRunWhereTheProcessorHasThem) {
+  if (!Vireo::Platform::ProcessorHasAvx2()) {
+    GTEST_SKIP() << "no AVX2 on this processor: only the portable kernels are held to the oracle";
+  }
+  EXPECT_TRUE(UseWideKernels());
+  ForcePortableKernels(true);
+  EXPECT_FALSE(UseWideKernels());
+  ForcePortableKernels(false);
+  EXPECT_TRUE(UseWideKernels());
+}
 
 // A cancel point: mostly none, else somewhere in the run's calls.
 int32_t DrawCancel(Random& r, int32_t calls) {
@@ -80,7 +109,7 @@ void FillList(DoubleList& list, int32_t count, Random& r) {
   for (int32_t i = 0; i < count; ++i) list.data[i] = r.Unit() * 1000.0;
 }
 
-TEST(LiteralEqualityTest, ProfilesOnRandomFrames) {
+TEST_P(LiteralEqualityTest, ProfilesOnRandomFrames) {
   const int32_t cases = CaseCount(150);
   for (int32_t i = 0; i < cases; ++i) {
     FrameCase c = DrawFrameCase(CaseSeed("profiles", i));
@@ -121,7 +150,7 @@ TEST(LiteralEqualityTest, ProfilesOnRandomFrames) {
   }
 }
 
-TEST(LiteralEqualityTest, EdgeMapOnRandomFrames) {
+TEST_P(LiteralEqualityTest, EdgeMapOnRandomFrames) {
   const int32_t cases = CaseCount(150);
   for (int32_t i = 0; i < cases; ++i) {
     const FrameCase c = DrawFrameCase(CaseSeed("edge map", i));
@@ -159,7 +188,7 @@ TEST(LiteralEqualityTest, EdgeMapOnRandomFrames) {
 
 // Plane 0 of the input as an edge map: written by the edge map stage, or
 // left as the case painted it (near-limit and hostile bytes).
-TEST(LiteralEqualityTest, EdgePointsOnRandomMaps) {
+TEST_P(LiteralEqualityTest, EdgePointsOnRandomMaps) {
   const int32_t cases = CaseCount(200);
   for (int32_t i = 0; i < cases; ++i) {
     FrameCase c = DrawFrameCase(CaseSeed("edge points", i));
@@ -264,7 +293,7 @@ void DrawPoints(Random& r, DoubleList& xs, DoubleList& ys, bool far) {
   }
 }
 
-TEST(LiteralEqualityTest, AngleOnRandomPointLists) {
+TEST_P(LiteralEqualityTest, AngleOnRandomPointLists) {
   const int32_t cases = CaseCount(300);
   for (int32_t i = 0; i < cases; ++i) {
     const uint64_t seed = CaseSeed("angle", i);
@@ -291,7 +320,7 @@ TEST(LiteralEqualityTest, AngleOnRandomPointLists) {
   }
 }
 
-TEST(LiteralEqualityTest, BoxFitOnRandomPointLists) {
+TEST_P(LiteralEqualityTest, BoxFitOnRandomPointLists) {
   const int32_t cases = CaseCount(300);
   for (int32_t i = 0; i < cases; ++i) {
     const uint64_t seed = CaseSeed("box fit", i);
@@ -352,7 +381,7 @@ void ExpectSameRun(TestFrame& mine, TestFrame& literal, int32_t cancel, int32_t 
   EXPECT_EQ(FirstByteDifference(mine.Output().Storage(), literal.Output().Storage()), -1);
 }
 
-TEST(LiteralEqualityTest, WholeRunsOnRandomFrames) {
+TEST_P(LiteralEqualityTest, WholeRunsOnRandomFrames) {
   const int32_t cases = CaseCount(120);
   for (int32_t i = 0; i < cases; ++i) {
     const FrameCase c = DrawFrameCase(CaseSeed("whole run", i), 220);
@@ -387,7 +416,7 @@ TEST(LiteralEqualityTest, WholeRunsOnRandomFrames) {
   }
 }
 
-TEST(LiteralEqualityTest, WholeRunsOnGoldenPages) {
+TEST_P(LiteralEqualityTest, WholeRunsOnGoldenPages) {
   for (const AnalysisTest::GoldenPage& golden : AnalysisTest::GoldenPages()) {
     SCOPED_TRACE(golden.name);
     const Synth::Page page = Synth::GeneratePage(golden.spec);

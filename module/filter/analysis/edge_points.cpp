@@ -4,7 +4,8 @@
 // pixel; pass 2 then needs to look only from the right end back to it (and
 // at the right end alone when pass 1 found none). Together they give each
 // row's leftmost and rightmost edge pixel, so a column pass tests a row only
-// where that span covers the column. The column passes take a band of
+// where that span covers the column, and walks only the rows from the first
+// to the last that has an edge pixel. The column passes take a band of
 // columns row by row, so that a row's bytes serve the whole band while they
 // are in the cache. Every answer is the one a full scan of the line gives,
 // and each line's abort test and progress step still come first, in line
@@ -88,6 +89,7 @@ class Search {
   }
 
   bool ColumnPass(bool fromTop, AnalysisHost& host, ProgressCounter& progress, PointSink& sink) {
+    FindEdgeRows();
     int32_t rows[kBand];
     for (int32_t first = left_; first <= right_; first += kBand) {
       const int32_t count = std::min(kBand, right_ - first + 1);
@@ -129,16 +131,32 @@ class Search {
     return x;
   }
 
+  // The first and last row with an edge pixel, once the row passes are
+  // through: the column passes need not walk the rows outside them. With
+  // no row spans every row is walked.
+  void FindEdgeRows() {
+    edgeRowsLow_ = top_;
+    edgeRowsHigh_ = bottom_;
+    if (!spans_.Known()) return;
+    while (edgeRowsLow_ <= bottom_ && spans_.Low(edgeRowsLow_ - top_) == kNone) ++edgeRowsLow_;
+    while (edgeRowsHigh_ >= top_ && spans_.Low(edgeRowsHigh_ - top_) == kNone) --edgeRowsHigh_;
+  }
+
   // Pass 3 (from the top) or 4 (from the bottom) for columns first ...
   // first + count - 1: the row of each column's point, or kNone.
   void BandPoints(int32_t first, int32_t count, bool fromTop, int32_t* rows) const {
     std::fill_n(rows, count, kNone);
-    const int32_t start = fromTop ? top_ : bottom_;
-    const int32_t stop = fromTop ? bottom_ : top_;  // not scanned
+    // Rows top ... bottom - 1 from the top, bottom ... top + 1 from the
+    // bottom, less those outside the rows with an edge pixel.
+    const int32_t start = fromTop ? std::max(top_, edgeRowsLow_) : std::min(bottom_, edgeRowsHigh_);
+    const int32_t end = fromTop ? std::min(bottom_ - 1, edgeRowsHigh_)
+                                : std::max(top_ + 1, edgeRowsLow_);  // scanned
     const int32_t dy = fromTop ? 1 : -1;
+    const int32_t stop = end + dy;
     const int32_t bandLast = first + count - 1;
     uint64_t open = count == 64 ? ~0ULL : (1ULL << count) - 1;
-    for (int32_t y = start; y != stop && open != 0; y += dy) {
+    const bool none = fromTop ? start > end : start < end;
+    for (int32_t y = start; !none && y != stop && open != 0; y += dy) {
       int32_t low = first;
       int32_t high = bandLast;
       if (spans_.Known()) {
@@ -164,6 +182,8 @@ class Search {
   int32_t top_;
   int32_t bottom_;
   RowSpans spans_;
+  int32_t edgeRowsLow_ = 0;
+  int32_t edgeRowsHigh_ = 0;
 };
 
 }  // namespace

@@ -3,6 +3,8 @@
 
 #include <algorithm>
 
+#include "filter/analysis/kernel_choice.h"
+
 namespace Project {
 namespace {
 
@@ -11,10 +13,26 @@ namespace {
 constexpr int32_t kWideChunk = 512;
 constexpr int32_t kChunk = 32;
 
-uint8_t SmallestByte(const uint8_t* bytes, std::ptrdiff_t count) {
+FRINGE_KERNEL_BODY uint8_t SmallestByteBody(const uint8_t* bytes, std::ptrdiff_t count) {
   uint8_t smallest = 255;
   for (std::ptrdiff_t i = 0; i < count; ++i) smallest = std::min(smallest, bytes[i]);
   return smallest;
+}
+
+uint8_t SmallestBytePortable(const uint8_t* bytes, std::ptrdiff_t count) {
+  return SmallestByteBody(bytes, count);
+}
+#if FRINGE_WIDE_KERNELS
+FRINGE_WIDE_TARGET uint8_t SmallestByteWide(const uint8_t* bytes, std::ptrdiff_t count) {
+  return SmallestByteBody(bytes, count);
+}
+#endif
+
+uint8_t SmallestByte(const uint8_t* bytes, std::ptrdiff_t count) {
+#if FRINGE_WIDE_KERNELS
+  if (UseWideKernels()) return SmallestByteWide(bytes, count);
+#endif
+  return SmallestBytePortable(bytes, count);
 }
 
 }  // namespace

@@ -21,6 +21,7 @@
 #include "filter/analysis/channels.h"
 #include "filter/analysis/frame_size.h"
 #include "filter/analysis/host_calls.h"
+#include "filter/analysis/kernel_choice.h"
 #include "filter/analysis/pixel_access.h"
 
 namespace Project {
@@ -91,7 +92,8 @@ void Normalise(const ProfileSource& src, double* columns, double* rows) {
 
 // Adds 255 - byte of `lanes` bytes to the 16-bit accumulators and answers
 // their total.
-uint32_t AddRowLanes(const uint8_t* __restrict bytes, uint16_t* __restrict sums, int32_t lanes) {
+FRINGE_KERNEL_BODY uint32_t AddRowLanesBody(const uint8_t* __restrict bytes,
+                                            uint16_t* __restrict sums, int32_t lanes) {
   uint32_t total = 0;
   for (int32_t start = 0; start < lanes; start += kBytesPerBlock) {
     const int32_t end = std::min(start + kBytesPerBlock, lanes);
@@ -106,9 +108,42 @@ uint32_t AddRowLanes(const uint8_t* __restrict bytes, uint16_t* __restrict sums,
   return total;
 }
 
-void FlushLanes(uint16_t* __restrict sums, uint32_t* __restrict totals, int32_t lanes) {
+FRINGE_KERNEL_BODY void FlushLanesBody(uint16_t* __restrict sums, uint32_t* __restrict totals,
+                                       int32_t lanes) {
   for (int32_t i = 0; i < lanes; ++i) totals[i] += sums[i];
   std::fill_n(sums, lanes, uint16_t{0});
+}
+
+uint32_t AddRowLanesPortable(const uint8_t* bytes, uint16_t* sums, int32_t lanes) {
+  return AddRowLanesBody(bytes, sums, lanes);
+}
+void FlushLanesPortable(uint16_t* sums, uint32_t* totals, int32_t lanes) {
+  FlushLanesBody(sums, totals, lanes);
+}
+#if FRINGE_WIDE_KERNELS
+FRINGE_WIDE_TARGET uint32_t AddRowLanesWide(const uint8_t* bytes, uint16_t* sums, int32_t lanes) {
+  return AddRowLanesBody(bytes, sums, lanes);
+}
+FRINGE_WIDE_TARGET void FlushLanesWide(uint16_t* sums, uint32_t* totals, int32_t lanes) {
+  FlushLanesBody(sums, totals, lanes);
+}
+#endif
+
+uint32_t AddRowLanes(const uint8_t* bytes, uint16_t* sums, int32_t lanes) {
+#if FRINGE_WIDE_KERNELS
+  if (UseWideKernels()) return AddRowLanesWide(bytes, sums, lanes);
+#endif
+  return AddRowLanesPortable(bytes, sums, lanes);
+}
+
+void FlushLanes(uint16_t* sums, uint32_t* totals, int32_t lanes) {
+#if FRINGE_WIDE_KERNELS
+  if (UseWideKernels()) {
+    FlushLanesWide(sums, totals, lanes);
+    return;
+  }
+#endif
+  FlushLanesPortable(sums, totals, lanes);
 }
 
 // Pixels of packed channels (column distance = channel count): each row is
