@@ -216,5 +216,13 @@ extern "C" int LLVMFuzzerTestOneInput(const uint8_t* data, size_t size) {
     host.Problems().Clear();
     Fuzz::Check(host.Records(kRecordType).size() <= 1, "more than one 'fRNG' record after " + what);
   }
+  // A run that stopped at a failing continue leaves its object alive for the
+  // next run; this host's next run is its last, a lone finish that ends the
+  // object before the host goes, so that every input starts from a module
+  // with no run in progress.
+  host.BeginRun();
+  faults.CheckResult(host.Call(Standin::kFinish), "the last finish");
+  faults.CheckProblems(host.Problems(), false, "the last finish");
+  Fuzz::Check(host.Records(kRecordType).size() <= 1, "more than one 'fRNG' record at the end");
   return 0;
 }
