@@ -81,6 +81,12 @@ void AddCommon(CLI::App* sub, Options& o) {
                   "so an interrupted batch resumes where it stopped")
       ->type_name("FILE");
   sub->add_flag("-q,--quiet", o.quiet, "No progress or summary on standard error");
+  sub->add_option("--page-timeout", o.pageTimeout,
+                  "Seconds a page may take; a page still running then is stopped and reported "
+                  "as failed (0: no limit)")
+      ->capture_default_str()
+      ->check(CLI::Range(0, 86400))
+      ->type_name("SECONDS");
   sub->add_option("--module", o.modulePath, "The module file (default: Fringe.9zf next to fringe)")
       ->type_name("FILE");
   sub->add_option("--max-side", o.page.maxSide,
