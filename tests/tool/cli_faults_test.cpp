@@ -69,7 +69,7 @@ TEST_F(FaultsTest, AWorkerThatCrashesOrHangsCostsOnlyItsPage) {
     EXPECT_EQ(lines[2]["file"], hang);
     EXPECT_EQ(lines[2]["status"], "error");
     EXPECT_EQ(lines[2]["error_kind"], "internal");
-    EXPECT_NE(lines[2]["error"].get<std::string>().find("stopped after 2 s (--page-timeout)"),
+    EXPECT_NE(lines[2]["error"].get<std::string>().find("stopped after 3 s (--page-timeout)"),
               std::string::npos)
         << lines[2];
     EXPECT_NE(r.err.find(crash + ":"), std::string::npos) << r.err;
