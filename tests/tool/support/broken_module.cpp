@@ -1,10 +1,9 @@
 // A deliberately broken module file for the tool's fault tests. At prepare it
-// looks at the document's width: a width ending in 1 crashes the process, a
+// looks at the document's width: a width ending in 1 aborts the process, a
 // width ending in 3 hangs it for good. Every other call goes on to the real
 // module named by FRINGE_FORWARD_MODULE (when set; otherwise it answers
 // success and publishes nothing), so that healthy pages get real answers.
 #include <dlfcn.h>
-#include <signal.h>
 #include <unistd.h>
 
 #include <cstdint>
@@ -36,7 +35,7 @@ extern "C" __attribute__((visibility("default"))) void ENTRYPOINT1(int16_t selec
   if (selector == kPrepare && record != nullptr) {
     int16_t width = 0;
     std::memcpy(&width, static_cast<const char*>(record) + kDocumentWidthOffset, sizeof width);
-    if (width % 10 == 1) ::raise(SIGSEGV);
+    if (width % 10 == 1) std::abort();
     if (width % 10 == 3) {
       for (;;) ::pause();
     }
