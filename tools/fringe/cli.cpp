@@ -61,7 +61,8 @@ Exit codes:
   1   some page had no photo
   2   some input could not be read, decoded, or was refused (too large, not an image)
   64  wrong command line
-  70  internal failure: the module could not be loaded or run, a worker process died
+  70  internal failure: the module could not be loaded or run, a worker process died or a
+      page overran --page-timeout
   73  an output file could not be written
   A batch exits with the most serious of its pages' codes.
 
