@@ -47,6 +47,9 @@ void RunFaults::Removed(Standin::Proc proc) {
 
 void RunFaults::Failing(Standin::Proc proc, int32_t error) {
   Tell(error == 0 ? "raising" : "failing", proc, error);
+  if (proc == Standin::Proc::RecordGet || proc == Standin::Proc::RecordDelete) {
+    hostKeepsRecords_ = true;
+  }
   if (error != 0) codes_.insert(error);
   // A raise unwinds through the module from wherever it happens; not every
   // path that unwinds gives back what it holds (see the report).

@@ -28,6 +28,10 @@ class RunFaults {
   void Shaped(Standin::Table table);
   // A code that advance state itself answers.
   void Produces(int16_t code) { codes_.insert(code); }
+  // The host may keep an old record beside the new one: its get answered
+  // null for a slot (which the module skips, as it must) or its delete,
+  // which answers nothing, did nothing.
+  bool HostKeepsRecords() const { return hostKeepsRecords_; }
 
   // A selector's result: 0, 1, or a code that came from the host.
   void CheckResult(int16_t result, const std::string& where) const;
@@ -41,6 +45,7 @@ class RunFaults {
   std::set<int32_t> codes_;
   bool disposalBroken_ = false;
   bool closeMissing_ = false;
+  bool hostKeepsRecords_ = false;
 };
 
 }  // namespace Fuzz

@@ -10,4 +10,5 @@ $SUDO apt-get install -y -qq --no-install-recommends \
   googletest libgtest-dev libbenchmark-dev \
   g++-mingw-w64-x86-64-posix binutils-mingw-w64-x86-64 wine wine64 \
   libvips-dev libcli11-dev nlohmann-json3-dev zlib1g-dev \
-  icoutils clang-format valgrind file procps >/dev/null
+  icoutils clang-format valgrind file procps \
+  clang libclang-rt-14-dev >/dev/null

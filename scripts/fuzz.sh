@@ -1,7 +1,8 @@
 #!/usr/bin/env bash
 # Builds the fuzz preset and runs every fuzz target for a bounded time.
-#   scripts/fuzz.sh            about 60 s per target (what CI runs)
-#   scripts/fuzz.sh 3600       an hour per target
+#   scripts/fuzz.sh                      about 60 s per target (what CI runs)
+#   scripts/fuzz.sh 3600                 an hour per target
+#   scripts/fuzz.sh 600 module_run       only the targets named
 # Each target starts from its seed corpus (fuzz/corpus/<target>) and keeps what
 # it learns in build/fuzz/corpus/<target>. A finding is written to
 # build/fuzz/findings/ and the script fails; once fixed, copy the input to
@@ -9,6 +10,9 @@
 set -euo pipefail
 cd "$(dirname "$0")/.."
 seconds="${1:-60}"
+shift || true
+targets=("$@")
+if [ "${#targets[@]}" -eq 0 ]; then targets=(module_run key_strings page_loading); fi
 jobs="${FRINGE_JOBS:-2}"
 
 cmake --preset fuzz >/dev/null
@@ -20,7 +24,7 @@ export FRINGE_ALERT_LOG=/dev/null
 export ASAN_OPTIONS="detect_leaks=1:abort_on_error=1"
 export UBSAN_OPTIONS="print_stacktrace=1:halt_on_error=1"
 status=0
-for target in module_run key_strings page_loading; do
+for target in "${targets[@]}"; do
   corpus="build/fuzz/corpus/$target"
   mkdir -p "$corpus"
   echo "== $target: ${seconds} s"

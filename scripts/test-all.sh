@@ -1,5 +1,6 @@
 #!/usr/bin/env bash
-# Builds every preset and runs every test: native, sanitizers, Windows under Wine.
+# Builds every preset and runs every test: native, valgrind, the fuzz targets
+# for a bounded time, sanitizers, Windows under Wine.
 set -euo pipefail
 cd "$(dirname "$0")/.."
 jobs="${FRINGE_JOBS:-2}"
@@ -16,6 +17,8 @@ run_preset() {
 run_preset release
 echo "== memcheck: one complete run under valgrind"
 bash scripts/memcheck.sh
+echo "== fuzz: every target for a bounded time"
+FRINGE_JOBS="$jobs" bash scripts/fuzz.sh "${FRINGE_FUZZ_SECONDS:-60}"
 run_preset asan
 bash scripts/wine-prefix.sh
 run_preset windows

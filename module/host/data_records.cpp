@@ -37,8 +37,12 @@ void CRastrixPlugin::AddDataRecord(uint32_t type, HostHandle handle) {
 
 void CRastrixPlugin::PublishDataRecord(uint32_t type, const void* bytes, int32_t size) {
   if (!HasDataRecordProcs()) return;
+  const int32_t count = CountDataRecords(type);
+  // No list has fewer than no records: the host could not count them, and a
+  // record added now could sit beside ones that were never deleted.
+  if (count < 0) throw CRastrixError(static_cast<int16_t>(count));
   // Downward, so that the indexes still to visit stay valid.
-  for (int32_t index = CountDataRecords(type); index >= 1; --index) {
+  for (int32_t index = count; index >= 1; --index) {
     const auto position = static_cast<int16_t>(index);
     if (GetDataRecord(type, position) != nullptr) DeleteDataRecord(type, position);
   }

@@ -80,6 +80,13 @@ int16_t ServeContinue(void* record, intptr_t* dataSlot, CRastrixFilter*& working
   if (working == nullptr) return 0;
   const int16_t result = working->OnContinue(record, dataSlot);
   working->HandlePendingEvents();
+  if (result != 0) {
+    // A host ends the run at a failing continue without a finish, and its
+    // next run may hand over other tables: the object lives on, but nothing
+    // it took from this run's record may be called after this call returns.
+    working->ReleaseHostSuites();
+    InstallTileAllocator(nullptr);
+  }
   return result;
 }
 

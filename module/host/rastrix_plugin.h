@@ -50,6 +50,10 @@ class CRastrixPlugin : public CProcess {
   const void* Suite(SuiteId id);
   // The cached suite pointer, without trying to acquire it.
   const void* CachedSuite(SuiteId id) const { return suites_.at(static_cast<size_t>(id)); }
+  // Releases every cached suite through the basic suite they came from and
+  // forgets that basic suite, so that later requests acquire afresh from the
+  // record then attached. For an object that outlives the host's run.
+  void ReleaseHostSuites();
 
   // Host properties.
   bool HasPropertyProcs() const;

@@ -41,4 +41,10 @@ void CRastrixPlugin::ReleaseCachedSuites() {
   }
 }
 
+void CRastrixPlugin::ReleaseHostSuites() {
+  ReleaseCachedSuites();
+  basicSuite_ = nullptr;
+  translationSuitesFetched_ = false;
+}
+
 }  // namespace Vireo

@@ -67,7 +67,7 @@ TEST(ResultsLog, InternalFailuresAreTriedAgain) {
   EXPECT_EQ(again.Done().at("b.png").status, PageStatus::Found);
 }
 
-TEST(ResultsLog, APartialLastLineIsSkippedAndTheNextRecordStartsFresh) {
+TEST(ResultsLog, APartialLastLineIsCutOffAndThePageRecordedOnceWhenDone) {
   FringeTest::TempFolder tmp;
   const std::string path = tmp / "results.jsonl";
   const std::string whole = JsonLine(Found("a.png")) + "\n";
@@ -81,10 +81,23 @@ TEST(ResultsLog, APartialLastLineIsSkippedAndTheNextRecordStartsFresh) {
     EXPECT_EQ(log.Done().size(), 1u);
     log.Append(Found("b.png"));
   }
-  EXPECT_EQ(ReadAll(path),
-            whole + "not json at all\n" + cut + "\n" + JsonLine(Found("b.png")) + "\n");
+  EXPECT_EQ(ReadAll(path), whole + "not json at all\n" + JsonLine(Found("b.png")) + "\n");
   ResultsLog again(path);
   EXPECT_EQ(again.Done().size(), 2u);
+}
+
+TEST(ResultsLog, AWholeLastRecordWithoutItsLineEndIsKept) {
+  FringeTest::TempFolder tmp;
+  const std::string path = tmp / "results.jsonl";
+  const std::string a = JsonLine(Found("a.png"));
+  { std::ofstream(path) << a; }
+  {
+    ResultsLog log(path);
+    EXPECT_TRUE(log.Warnings().empty());
+    EXPECT_EQ(log.Done().count("a.png"), 1u);
+    log.Append(Found("b.png"));
+  }
+  EXPECT_EQ(ReadAll(path), a + "\n" + JsonLine(Found("b.png")) + "\n");
 }
 
 TEST(ResultsLog, AnUnusablePathIsAnOutputError) {

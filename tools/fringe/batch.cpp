@@ -4,6 +4,7 @@
 #include <unistd.h>
 
 #include <cstdio>
+#include <cstdlib>
 #include <memory>
 #include <optional>
 #include <thread>
@@ -12,6 +13,7 @@
 #include "input_walk.h"
 #include "output_dir.h"
 #include "page_job.h"
+#include "page_watchdog.h"
 #include "photo_detector.h"
 #include "progress.h"
 #include "report_text.h"
@@ -141,11 +143,20 @@ int RunBatch(const Options& o) {
       PhotoDetector detector(modulePath);
       if (tasks.size() == 1) {
         PageProcessor processor(detector, o.page);
-        done(0, processor.Process(tasks[0]));
+        PageWatchdog watchdog(o.pageTimeout, [&] {
+          done(0, ErrorResult(tasks[0].display, ErrorKind::Internal,
+                              "stopped after " + std::to_string(o.pageTimeout) +
+                                  " s (--page-timeout) while processing this page"));
+          std::fflush(nullptr);
+          std::_Exit(WorseExit(exitCode, kExitInternal));
+        });
+        PageResult result = processor.Process(tasks[0]);
+        watchdog.Disarm();
+        done(0, std::move(result));
       } else {
         // Batches run in worker processes even one at a time, so that a page
-        // that brings the module down costs only that page.
-        WorkerPool(jobs, modulePath, o.page).Run(tasks, done);
+        // that brings the module down or hangs costs only that page.
+        WorkerPool(jobs, modulePath, o.page, o.pageTimeout).Run(tasks, done);
       }
     } catch (const PageError& e) {
       pageProgress.Error(e.what());

@@ -61,7 +61,8 @@ Exit codes:
   1   some page had no photo
   2   some input could not be read, decoded, or was refused (too large, not an image)
   64  wrong command line
-  70  internal failure: the module could not be loaded or run, a worker process died
+  70  internal failure: the module could not be loaded or run, a worker process died or a
+      page overran --page-timeout
   73  an output file could not be written
   A batch exits with the most serious of its pages' codes.
 
@@ -81,6 +82,12 @@ void AddCommon(CLI::App* sub, Options& o) {
                   "so an interrupted batch resumes where it stopped")
       ->type_name("FILE");
   sub->add_flag("-q,--quiet", o.quiet, "No progress or summary on standard error");
+  sub->add_option("--page-timeout", o.pageTimeout,
+                  "Seconds a page may take; a page still running then is stopped and reported "
+                  "as failed (0: no limit)")
+      ->capture_default_str()
+      ->check(CLI::Range(0, 86400))
+      ->type_name("SECONDS");
   sub->add_option("--module", o.modulePath, "The module file (default: Fringe.9zf next to fringe)")
       ->type_name("FILE");
   sub->add_option("--max-side", o.page.maxSide,

@@ -38,6 +38,7 @@ struct Options {
   bool json = false;
   std::string resultsFile;
   bool quiet = false;
+  int pageTimeout = 120;  // seconds a worker may spend on one page; 0: no limit
 };
 
 }  // namespace Fringe

@@ -46,15 +46,32 @@ std::string LoaderFamily(const char* loader) {
   return name;
 }
 
-// Loaders that libvips marks untrusted are blocked; a file that only such a
-// loader claims is, for fringe, not an image (often a damaged one).
-bool IsBlockedLoader(const char* loader) {
-  const GType type = vips_type_find("VipsOperation", loader);
-  if (type == 0) return false;
-  auto* klass = static_cast<VipsOperationClass*>(g_type_class_ref(type));
-  const bool blocked = (klass->flags & (VIPS_OPERATION_UNTRUSTED | VIPS_OPERATION_BLOCKED)) != 0;
-  g_type_class_unref(klass);
-  return blocked;
+// Among the loaders libvips trusts, the first (in libvips' own order of
+// preference) that claims the file, by its leading bytes or, for loaders that
+// cannot sniff, by its name; null when none does. Loaders that libvips marks
+// untrusted are not even asked: some read the whole file, decompressing it
+// into memory, just to answer, and a file only they would claim is, for
+// fringe, not an image (often a damaged one).
+const char* FindTrustedLoader(const std::string& path) {
+  const VipsSListMap2Fn claims = [](void* item, void* file, void*) -> void* {
+    auto* load = static_cast<VipsForeignLoadClass*>(item);
+    const VipsForeignClass& foreign = load->parent_class;
+    const VipsOperationClass& operation = foreign.parent_class;
+    const VipsObjectClass& object = operation.parent_class;
+    const auto* name = static_cast<const char*>(file);
+    // Memory and stream loaders are the same formats again.
+    if (vips_ispostfix(object.nickname, "_buffer") || vips_ispostfix(object.nickname, "_source")) {
+      return nullptr;
+    }
+    if ((operation.flags & (VIPS_OPERATION_UNTRUSTED | VIPS_OPERATION_BLOCKED)) != 0)
+      return nullptr;
+    if (load->is_a != nullptr) return load->is_a(name) ? item : nullptr;
+    if (foreign.suffs != nullptr && vips_filename_suffix_match(name, foreign.suffs)) return item;
+    return nullptr;
+  };
+  void* found =
+      vips_foreign_map("VipsForeignLoad", claims, const_cast<char*>(path.c_str()), nullptr);
+  return found != nullptr ? G_OBJECT_CLASS_NAME(found) : nullptr;
 }
 
 bool NeedsColourConversion(VipsInterpretation i) {
@@ -112,8 +129,8 @@ std::ptrdiff_t DecodedPage::RowBytes() const {
 
 DecodedPage LoadPage(const std::string& path, const LoadLimits& limits) {
   CheckFile(path);
-  const char* loader = vips_foreign_find_load(path.c_str());
-  if (loader == nullptr || IsBlockedLoader(loader)) {
+  const char* loader = FindTrustedLoader(path);
+  if (loader == nullptr) {
     vips_error_clear();
     Refuse("not an image format that libvips can read, or damaged beyond recognition");
   }

@@ -32,6 +32,15 @@ void WriteAll(int fd, const std::string& text, const std::string& path) {
   }
 }
 
+bool ParsesAsResult(const std::string& line) {
+  try {
+    ResultFromJson(nlohmann::json::parse(line));
+    return true;
+  } catch (const std::exception&) {
+    return false;
+  }
+}
+
 }  // namespace
 
 ResultsLog::ResultsLog(const std::string& path) : path_(path) {
@@ -46,15 +55,21 @@ ResultsLog::ResultsLog(const std::string& path) : path_(path) {
   while (start < text.size()) {
     const size_t end = text.find('\n', start);
     ++lineNo;
-    if (end == std::string::npos) {
-      // A run killed while writing: end the partial line so the next record
-      // starts on a line of its own.
-      warnings_.push_back(path + ":" + std::to_string(lineNo) + ": unfinished last line ignored");
-      WriteAll(fd_, "\n", path);
+    if (end == std::string::npos && !ParsesAsResult(text.substr(start))) {
+      // A run killed while writing: the partial line is cut off, so that the
+      // page it was for is recorded once, whole, when it is done again.
+      warnings_.push_back(path + ":" + std::to_string(lineNo) + ": unfinished last line dropped");
+      if (::ftruncate(fd_, static_cast<off_t>(start)) != 0) Fail(path, std::strerror(errno));
       break;
     }
-    const std::string line = text.substr(start, end - start);
-    start = end + 1;
+    const std::string line = text.substr(start, end == std::string::npos ? end : end - start);
+    if (end == std::string::npos) {
+      // A whole record that only lacks its line end (written by hand): kept.
+      WriteAll(fd_, "\n", path);
+      start = text.size();
+    } else {
+      start = end + 1;
+    }
     if (line.empty()) continue;
     try {
       PageResult r = ResultFromJson(nlohmann::json::parse(line));

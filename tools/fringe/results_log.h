@@ -1,7 +1,7 @@
 // The results file: one JSON line appended per finished page, read back at
 // start so that an interrupted batch resumes where it stopped. Each line goes
 // out in a single write, so a killed run leaves at most one partial line,
-// which is skipped (with a warning) when the file is read again.
+// which is cut off (with a warning) when the file is opened again.
 #pragma once
 
 #include <map>

@@ -8,7 +8,9 @@
 #include <sys/wait.h>
 #include <unistd.h>
 
+#include <algorithm>
 #include <cerrno>
+#include <chrono>
 #include <cstring>
 #include <filesystem>
 #include <optional>
@@ -22,12 +24,15 @@ namespace Fringe {
 
 namespace {
 
+using Clock = std::chrono::steady_clock;
+
 struct Worker {
   pid_t pid = -1;
   int in = -1;   // the worker's standard input
   int out = -1;  // the worker's standard output
   std::string buffer;
   std::optional<size_t> task;
+  Clock::time_point deadline;  // when the page in hand has had its time
   std::string fatal;
 };
 
@@ -103,10 +108,23 @@ int Reap(Worker& w) {
   return status;
 }
 
+// Milliseconds until the first worker's page has had its time; -1: no limit.
+int PollTimeout(const std::vector<Worker>& pool, int pageTimeout) {
+  if (pageTimeout <= 0) return -1;
+  std::optional<Clock::time_point> first;
+  for (const Worker& w : pool) {
+    if (w.task && (!first || w.deadline < *first)) first = w.deadline;
+  }
+  if (!first) return -1;
+  const auto wait = std::chrono::ceil<std::chrono::milliseconds>(*first - Clock::now()).count();
+  return static_cast<int>(std::clamp<long long>(wait, 0, 60 * 1000));
+}
+
 }  // namespace
 
-WorkerPool::WorkerPool(int workers, std::string modulePath, const PageSettings& settings)
-    : workers_(workers), setupLine_(SetupLine(modulePath, settings)) {}
+WorkerPool::WorkerPool(int workers, std::string modulePath, const PageSettings& settings,
+                       int pageTimeout)
+    : workers_(workers), setupLine_(SetupLine(modulePath, settings)), pageTimeout_(pageTimeout) {}
 
 void WorkerPool::Run(const std::vector<PageTask>& tasks,
                      const std::function<void(size_t, PageResult)>& done) {
@@ -123,6 +141,7 @@ void WorkerPool::Run(const std::vector<PageTask>& tasks,
   auto feed = [&](Worker& w) {
     if (next < tasks.size()) {
       w.task = next;
+      w.deadline = Clock::now() + std::chrono::seconds(pageTimeout_);
       WriteLine(w.in, JobLine(next, tasks[next]));
       ++next;
     }
@@ -152,13 +171,26 @@ void WorkerPool::Run(const std::vector<PageTask>& tasks,
     }
     std::vector<pollfd> fds;
     for (const Worker& w : pool) fds.push_back({w.out, POLLIN, 0});
-    if (::poll(fds.data(), fds.size(), -1) < 0) {
+    if (::poll(fds.data(), fds.size(), PollTimeout(pool, pageTimeout_)) < 0) {
       if (errno == EINTR) continue;
       break;
     }
+    const Clock::time_point now = Clock::now();
     for (size_t i = pool.size(); i-- > 0;) {
-      if (fds[i].revents == 0) continue;
       Worker& w = pool[i];
+      if (fds[i].revents == 0) {
+        if (pageTimeout_ <= 0 || !w.task || now < w.deadline) continue;
+        // Hung, or too slow: the page fails, the batch goes on.
+        w.fatal =
+            "worker process stopped after " + std::to_string(pageTimeout_) + " s (--page-timeout)";
+        ::kill(w.pid, SIGKILL);
+        Reap(w);
+        finish(*w.task, ErrorResult(tasks[*w.task].display, ErrorKind::Internal,
+                                    w.fatal + " while processing this page"));
+        pool.erase(pool.begin() + static_cast<std::ptrdiff_t>(i));
+        if (next < tasks.size()) startWorker();
+        continue;
+      }
       char chunk[4096];
       const ssize_t n = ::read(w.out, chunk, sizeof chunk);
       if (n < 0 && errno == EINTR) continue;

@@ -20,7 +20,8 @@ struct ProfileStrip {
   std::vector<float> values;  // lines x width; NaN where the area ends
 
   double At(int line, int k) const {
-    return values[static_cast<size_t>(line) * static_cast<size_t>(width) + static_cast<size_t>(k)];
+    return static_cast<double>(
+        values[static_cast<size_t>(line) * static_cast<size_t>(width) + static_cast<size_t>(k)]);
   }
   double OffsetOf(int k) const { return sFrom + sStep * k; }
 };

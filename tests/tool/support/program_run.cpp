@@ -42,6 +42,9 @@ std::string FringeModule() {
 std::string CrashingModule() {
   return FRINGE_TEST_CRASHING_MODULE;
 }
+std::string BrokenModule() {
+  return FRINGE_TEST_BROKEN_MODULE;
+}
 
 std::vector<nlohmann::json> RunOutcome::JsonLines() const {
   std::vector<nlohmann::json> lines;

@@ -28,6 +28,10 @@ std::string FringeProgram();
 std::string FringeModule();
 // A module file that aborts on pages of odd width and publishes nothing on others.
 std::string CrashingModule();
+// A module that crashes at prepare on pages whose width ends in 1, hangs on
+// those whose width ends in 3, and passes every other call on to the module
+// named by FRINGE_FORWARD_MODULE.
+std::string BrokenModule();
 
 // Runs fringe with args in folder cwd (empty: the current one).
 RunOutcome RunFringe(const std::vector<std::string>& args, const std::string& cwd = "");
