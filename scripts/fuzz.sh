@@ -7,6 +7,11 @@
 # it learns in build/fuzz/corpus/<target>. A finding is written to
 # build/fuzz/findings/ and the script fails; once fixed, copy the input to
 # fuzz/regressions/<target>/ so that the replay tests keep it fixed.
+#
+# FRINGE_FUZZ_CI=1 (what CI sets) makes the run repeatable: seed 1, a fresh
+# learned corpus and a fixed number of inputs per target (the time bound still
+# caps a slow machine), so that a finding fails the change that made it rather
+# than a later, unrelated one. FRINGE_FUZZ_SEED picks another seed.
 set -euo pipefail
 cd "$(dirname "$0")/.."
 seconds="${1:-60}"
@@ -23,12 +28,22 @@ mkdir -p "$findings"
 export FRINGE_ALERT_LOG=/dev/null
 export ASAN_OPTIONS="detect_leaks=1:abort_on_error=1"
 export UBSAN_OPTIONS="print_stacktrace=1:halt_on_error=1"
+ci="${FRINGE_FUZZ_CI:-0}"
+seed="${FRINGE_FUZZ_SEED:-$([ "$ci" = 1 ] && echo 1 || echo 0)}"  # 0: a new seed each run
+# Inputs per target in a CI run: about a minute each on two cores.
+declare -A ciRuns=([module_run]=20000 [key_strings]=1500000 [page_loading]=50000)
 status=0
 for target in "${targets[@]}"; do
   corpus="build/fuzz/corpus/$target"
+  limits=(-max_total_time="$seconds")
+  if [ "$ci" = 1 ]; then
+    corpus="build/fuzz/ci-corpus/$target"
+    rm -rf "$corpus"
+    limits+=(-runs="${ciRuns[$target]}")
+  fi
   mkdir -p "$corpus"
-  echo "== $target: ${seconds} s"
-  if ! "build/fuzz/fuzz/${target}_fuzzer" -max_total_time="$seconds" -rss_limit_mb=2048 \
+  echo "== $target: at most ${seconds} s, seed $seed"
+  if ! "build/fuzz/fuzz/${target}_fuzzer" "${limits[@]}" -seed="$seed" -rss_limit_mb=2048 \
       -timeout=20 -print_final_stats=1 -artifact_prefix="$findings/$target-" \
       "$corpus" "fuzz/corpus/$target" 2>"build/fuzz/$target.log"; then
     status=1

@@ -18,7 +18,7 @@ run_preset release
 echo "== memcheck: one complete run under valgrind"
 bash scripts/memcheck.sh
 echo "== fuzz: every target for a bounded time"
-FRINGE_JOBS="$jobs" bash scripts/fuzz.sh "${FRINGE_FUZZ_SECONDS:-60}"
+FRINGE_JOBS="$jobs" FRINGE_FUZZ_CI=1 bash scripts/fuzz.sh "${FRINGE_FUZZ_SECONDS:-60}"
 run_preset asan
 bash scripts/wine-prefix.sh
 run_preset windows
