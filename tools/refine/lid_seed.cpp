@@ -5,6 +5,7 @@
 #include <algorithm>
 #include <cmath>
 #include <cstdint>
+#include <limits>
 #include <vector>
 
 namespace Refine {
@@ -177,7 +178,8 @@ std::optional<Quad> MinimumAreaRectangle(std::vector<Vec2> points) {
     Vec2 u = edge * (1.0 / length);
     while (!(u.x > 0.0 && std::abs(u.y) <= u.x)) u = {-u.y, u.x};
     const Vec2 v{-u.y, u.x};
-    double minU = INFINITY, maxU = -INFINITY, minV = INFINITY, maxV = -INFINITY;
+    constexpr double kInf = std::numeric_limits<double>::infinity();
+    double minU = kInf, maxU = -kInf, minV = kInf, maxV = -kInf;
     for (const Vec2 p : hull) {
       minU = std::min(minU, Dot(p, u));
       maxU = std::max(maxU, Dot(p, u));
