@@ -31,7 +31,7 @@ export UBSAN_OPTIONS="print_stacktrace=1:halt_on_error=1"
 ci="${FRINGE_FUZZ_CI:-0}"
 seed="${FRINGE_FUZZ_SEED:-$([ "$ci" = 1 ] && echo 1 || echo 0)}"  # 0: a new seed each run
 # Inputs per target in a CI run: about a minute each on two cores.
-declare -A ciRuns=([module_run]=20000 [key_strings]=1500000 [page_loading]=50000)
+declare -A ciRuns=([module_run]=20000 [key_strings]=1500000 [page_loading]=40000)
 status=0
 for target in "${targets[@]}"; do
   corpus="build/fuzz/corpus/$target"
