@@ -25,12 +25,13 @@ std::unique_ptr<BenchPage> MakePage(const std::string& name, int width, int heig
                                     double angle) {
   auto bench = std::make_unique<BenchPage>();
   bench->name = name;
-  Synth::PageSpec spec;
-  spec.width = width;
-  spec.height = height;
-  spec.color = color;
-  spec.photo = Synth::PhotoSpec{width * 0.52, height * 0.47, width * 0.45, height * 0.38, angle};
-  bench->page = Synth::GeneratePage(spec);
+  Synth::PageRecipe recipe;
+  recipe.width = width;
+  recipe.height = height;
+  recipe.color = color;
+  recipe.photo =
+      Synth::PhotoRecipe{width * 0.52, height * 0.47, width * 0.45, height * 0.38, angle};
+  bench->page = Synth::GeneratePage(recipe);
   bench->input = bench->page.pixels;
   bench->output = bench->page.pixels;
 

@@ -51,17 +51,17 @@ Standin::Document MakeDocument(FuzzInput::Bytes& in) {
   const int planes = channels + (alpha ? 1 : 0);
   if (content == 1 && width >= 27 && height >= 27) {
     // A real photo on a page, so that inputs reach deep into the analysis.
-    Synth::PageSpec spec;
-    spec.width = width;
-    spec.height = height;
-    spec.color = channels == 3;
-    spec.alpha = alpha;
-    spec.seed = in.U16();
-    spec.photo =
-        Synth::PhotoSpec{width * (0.3 + in.Byte() / 640.0), height * (0.3 + in.Byte() / 640.0),
-                         width * (0.2 + in.Byte() / 512.0), height * (0.2 + in.Byte() / 512.0),
-                         in.Range(-450, 450) / 10.0};
-    Synth::Page page = Synth::GeneratePage(spec);
+    Synth::PageRecipe recipe;
+    recipe.width = width;
+    recipe.height = height;
+    recipe.color = channels == 3;
+    recipe.alpha = alpha;
+    recipe.seed = in.U16();
+    recipe.photo =
+        Synth::PhotoRecipe{width * (0.3 + in.Byte() / 640.0), height * (0.3 + in.Byte() / 640.0),
+                           width * (0.2 + in.Byte() / 512.0), height * (0.2 + in.Byte() / 512.0),
+                           in.Range(-450, 450) / 10.0};
+    Synth::Page page = Synth::GeneratePage(recipe);
     doc.SetPixels(std::move(page.pixels), static_cast<std::ptrdiff_t>(width) * planes);
   } else if (content == 2 && width > 0 && height > 0) {
     // Noise from a seed: cheap, and every sample differs.

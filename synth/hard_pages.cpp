@@ -79,8 +79,8 @@ std::array<HalfPlane, 4> HalfPlanesOf(const Corners& q) {
 
 // The paper's corners: the generator's rectangle, with the bottom edge slid
 // along the top edge so that the left and right sides turn by the shear.
-Corners PaperCorners(const HardPageSpec& s) {
-  PhotoSpec photo{s.centerX, s.centerY, s.paperWidth, s.paperHeight, s.angleDegrees};
+Corners PaperCorners(const HardPageRecipe& s) {
+  PhotoRecipe photo{s.centerX, s.centerY, s.paperWidth, s.paperHeight, s.angleDegrees};
   Corners c = PhotoCorners(photo);
   const double shift = 0.5 * s.paperHeight * std::tan(s.shearDegrees * kPi / 180.0);
   const double ux = (c[1][0] - c[0][0]) / s.paperWidth;
@@ -161,7 +161,7 @@ std::optional<Corners> ClipToPage(const Corners& q, double width, double height,
 }
 
 // Half extents of the turned paper along x and y.
-std::array<double, 2> Reach(const HardPageSpec& s) {
+std::array<double, 2> Reach(const HardPageRecipe& s) {
   const double a = s.angleDegrees * kPi / 180.0;
   const double extra = 0.5 * s.paperHeight * std::abs(std::tan(s.shearDegrees * kPi / 180.0));
   return {std::abs(std::cos(a)) * s.paperWidth * 0.5 + std::abs(std::sin(a)) * s.paperHeight * 0.5 +
@@ -177,8 +177,8 @@ struct Speck {
 // The picture's tones at a point in its own frame.
 class Picture {
  public:
-  Picture(const HardPageSpec& s, double width, double height, Draw& draw)
-      : spec_(s),
+  Picture(const HardPageRecipe& s, double width, double height, Draw& draw)
+      : recipe_(s),
         width_(width),
         height_(height),
         broad_(width, height, 90.0, draw.Source()),
@@ -196,7 +196,7 @@ class Picture {
     double t = 0.5 + 0.28 * broad_.At(u, v) + 0.07 * detail_.At(u, v);
     const double fromHorizon = v - (horizon_ + horizonTilt_ * (u - 0.5 * width_));
     t += 0.14 * std::tanh(-fromHorizon / 2.0);
-    if (spec_.innerLine) {
+    if (recipe_.innerLine) {
       const double depth = lineSide_ == 0   ? v
                            : lineSide_ == 1 ? width_ - u
                            : lineSide_ == 2 ? height_ - v
@@ -212,12 +212,12 @@ class Picture {
 
  private:
   double Tone(double t) const {
-    switch (spec_.tone) {
+    switch (recipe_.tone) {
       case PictureTone::kFaded:
-        return spec_.lidLevel - 62.0 + 55.0 * t;
+        return recipe_.lidLevel - 62.0 + 55.0 * t;
       case PictureTone::kSnowy: {
         const double dark = 1.0 - t;
-        return spec_.lidLevel - 3.0 - 160.0 * dark * dark * dark;
+        return recipe_.lidLevel - 3.0 - 160.0 * dark * dark * dark;
       }
       case PictureTone::kDark:
         return 4.0 + 70.0 * t;
@@ -227,7 +227,7 @@ class Picture {
     return 18.0 + 205.0 * t;
   }
 
-  HardPageSpec spec_;
+  HardPageRecipe recipe_;
   double width_, height_;
   ValueNoise broad_;
   ValueNoise blobs_[3];
@@ -237,14 +237,14 @@ class Picture {
   double lineDepth_;
 };
 
-void Validate(const HardPageSpec& s) {
+void Validate(const HardPageRecipe& s) {
   if (s.width < 32 || s.height < 32 || s.width > 32767 || s.height > 32767)
     throw std::invalid_argument("hard page size out of range: " + std::to_string(s.width) + " x " +
                                 std::to_string(s.height));
   const double values[] = {s.centerX,      s.centerY, s.paperWidth, s.paperHeight,  s.angleDegrees,
                            s.shearDegrees, s.border,  s.noise,      s.edgeSoftness, s.lidLevel};
   for (double v : values)
-    if (!std::isfinite(v)) throw std::invalid_argument("hard page spec has a non-finite value");
+    if (!std::isfinite(v)) throw std::invalid_argument("hard page recipe has a non-finite value");
   if (s.hasPhoto && (s.paperWidth < 8.0 || s.paperHeight < 8.0))
     throw std::invalid_argument("hard page paper is too small");
   if (s.hasPhoto &&
@@ -269,10 +269,10 @@ std::optional<HardKind> HardKindFromName(std::string_view name) {
   return std::nullopt;
 }
 
-HardPageSpec MakeHardPageSpec(HardKind kind, uint32_t seed, int width, int height) {
+HardPageRecipe MakeHardPageRecipe(HardKind kind, uint32_t seed, int width, int height) {
   Draw draw(0xA5D1C0DEULL ^ (static_cast<uint64_t>(seed) << 17U) ^
             (static_cast<uint64_t>(static_cast<int>(kind)) << 45U));
-  HardPageSpec s;
+  HardPageRecipe s;
   s.kind = kind;
   s.width = width;
   s.height = height;
@@ -393,10 +393,10 @@ HardPageSpec MakeHardPageSpec(HardKind kind, uint32_t seed, int width, int heigh
   return s;
 }
 
-HardPage GenerateHardPage(const HardPageSpec& s) {
+HardPage GenerateHardPage(const HardPageRecipe& s) {
   Validate(s);
   HardPage out;
-  out.spec = s;
+  out.recipe = s;
   out.hasPhoto = s.hasPhoto;
   Page& page = out.page;
   page.width = s.width;
@@ -564,18 +564,18 @@ HardPage GenerateHardPage(const HardPageSpec& s) {
   return out;
 }
 
-std::vector<HardPageSpec> HardPageSet(int count, uint32_t seed) {
+std::vector<HardPageRecipe> HardPageSet(int count, uint32_t seed) {
   static constexpr std::array<std::array<int, 2>, 4> kSizes = {
       {{2000, 1500}, {1600, 1200}, {1500, 2000}, {2400, 1800}}};
-  std::vector<HardPageSpec> specs;
+  std::vector<HardPageRecipe> recipes;
   const int kinds = static_cast<int>(HardKind::kCount);
   for (int i = 0; i < count; ++i) {
     const auto kind = static_cast<HardKind>(i % kinds);
     const auto& size = kSizes[static_cast<size_t>((i / kinds) % static_cast<int>(kSizes.size()))];
-    specs.push_back(
-        MakeHardPageSpec(kind, seed * 7919U + static_cast<uint32_t>(i), size[0], size[1]));
+    recipes.push_back(
+        MakeHardPageRecipe(kind, seed * 7919U + static_cast<uint32_t>(i), size[0], size[1]));
   }
-  return specs;
+  return recipes;
 }
 
 }  // namespace Synth

@@ -5,7 +5,7 @@
 // photos partly off the page, blank pages), each with its true outline.
 //
 // Coordinates follow the page generator: pixel (x, y) covers [x, x + 1) x
-// [y, y + 1). Built on the generator's random sources, so a spec always gives
+// [y, y + 1). Built on the generator's random sources, so a recipe always gives
 // the same bytes.
 #pragma once
 
@@ -53,7 +53,7 @@ struct SideShadow {
   double rampDepth = 0.0;   // fraction taken away right at the paper's edge
 };
 
-struct HardPageSpec {
+struct HardPageRecipe {
   HardKind kind = HardKind::kPlain;
   int width = 2000;
   int height = 1500;
@@ -93,7 +93,7 @@ struct HardPageSpec {
 };
 
 struct HardPage {
-  HardPageSpec spec;
+  HardPageRecipe recipe;
   Page page;  // corners: the visible paper outline, as the truth files give it
   bool hasPhoto = false;
   // The paper's outline and the picture inside a white margin (equal without
@@ -103,12 +103,13 @@ struct HardPage {
 };
 
 // A page of the given kind with its parameters drawn from the seed.
-HardPageSpec MakeHardPageSpec(HardKind kind, uint32_t seed, int width = 2000, int height = 1500);
+HardPageRecipe MakeHardPageRecipe(HardKind kind, uint32_t seed, int width = 2000,
+                                  int height = 1500);
 
-// Draws the page. Throws std::invalid_argument for a spec it cannot draw.
-HardPage GenerateHardPage(const HardPageSpec& spec);
+// Draws the page. Throws std::invalid_argument for a recipe it cannot draw.
+HardPage GenerateHardPage(const HardPageRecipe& recipe);
 
-// count specs that cycle through every kind, sizes and colour modes varying.
-std::vector<HardPageSpec> HardPageSet(int count, uint32_t seed);
+// count recipes that cycle through every kind, sizes and colour modes varying.
+std::vector<HardPageRecipe> HardPageSet(int count, uint32_t seed);
 
 }  // namespace Synth

@@ -44,7 +44,7 @@ uint8_t ToByte(double value) {
 // Kept between 25 and 170 so that its outline stands well clear of the paper.
 class PhotoTexture {
  public:
-  PhotoTexture(const PhotoSpec& photo, Random& random)
+  PhotoTexture(const PhotoRecipe& photo, Random& random)
       : height_(photo.height),
         light_(photo.width, photo.height, 57.0, random),
         hues_{ValueNoise(photo.width, photo.height, 97.0, random),
@@ -74,7 +74,7 @@ struct Placement {
   int x0, y0, x1, y1;  // pixel bounds that may be touched, x1 and y1 exclusive
 };
 
-Placement Place(const PhotoSpec& photo, int width, int height) {
+Placement Place(const PhotoRecipe& photo, int width, int height) {
   Placement p{};
   p.cx = photo.centerX;
   p.cy = photo.centerY;
@@ -90,13 +90,15 @@ Placement Place(const PhotoSpec& photo, int width, int height) {
   return p;
 }
 
-void Validate(const PageSpec& spec) {
-  if (spec.width < 1 || spec.height < 1 || spec.width > kMaxSide || spec.height > kMaxSide) {
-    throw std::invalid_argument("synthetic page size out of range: " + std::to_string(spec.width) +
-                                " x " + std::to_string(spec.height));
+void Validate(const PageRecipe& recipe) {
+  if (recipe.width < 1 || recipe.height < 1 || recipe.width > kMaxSide ||
+      recipe.height > kMaxSide) {
+    throw std::invalid_argument(
+        "synthetic page size out of range: " + std::to_string(recipe.width) + " x " +
+        std::to_string(recipe.height));
   }
-  if (spec.photo) {
-    const PhotoSpec& p = *spec.photo;
+  if (recipe.photo) {
+    const PhotoRecipe& p = *recipe.photo;
     const double values[] = {p.centerX, p.centerY, p.width, p.height, p.angleDegrees};
     for (double v : values) {
       if (!std::isfinite(v)) throw std::invalid_argument("synthetic photo has a non-finite value");
@@ -105,14 +107,14 @@ void Validate(const PageSpec& spec) {
       throw std::invalid_argument("synthetic photo needs a positive width and height");
     }
   }
-  if (!(spec.noise >= 0.0) || !std::isfinite(spec.noise)) {
+  if (!(recipe.noise >= 0.0) || !std::isfinite(recipe.noise)) {
     throw std::invalid_argument("synthetic page noise must be finite and not negative");
   }
 }
 
 }  // namespace
 
-std::array<std::array<double, 2>, 4> PhotoCorners(const PhotoSpec& photo) {
+std::array<std::array<double, 2>, 4> PhotoCorners(const PhotoRecipe& photo) {
   double sine = 0.0;
   double cosine = 0.0;
   SinCosDegrees(photo.angleDegrees, sine, cosine);
@@ -130,20 +132,20 @@ std::array<std::array<double, 2>, 4> PhotoCorners(const PhotoSpec& photo) {
   return corners;
 }
 
-Page GeneratePage(const PageSpec& spec) {
-  Validate(spec);
-  const int colorChannels = spec.color ? 3 : 1;
+Page GeneratePage(const PageRecipe& recipe) {
+  Validate(recipe);
+  const int colorChannels = recipe.color ? 3 : 1;
   Page page;
-  page.width = spec.width;
-  page.height = spec.height;
-  page.channels = colorChannels + (spec.alpha ? 1 : 0);
+  page.width = recipe.width;
+  page.height = recipe.height;
+  page.channels = colorChannels + (recipe.alpha ? 1 : 0);
   page.pixels.resize(static_cast<std::size_t>(page.width) * static_cast<std::size_t>(page.height) *
                      static_cast<std::size_t>(page.channels));
   const double w = page.width;
   const double h = page.height;
   page.corners = {{{0.0, 0.0}, {w, 0.0}, {w, h}, {0.0, h}}};
 
-  Random random(0x5EEDF00DULL ^ (static_cast<uint64_t>(spec.seed) << 20U));
+  Random random(0x5EEDF00DULL ^ (static_cast<uint64_t>(recipe.seed) << 20U));
   const ValueNoise paperBroad(w, h, 83.0, random);
   const ValueNoise paperGrain(w, h, 3.0, random);
   static constexpr double kPaperRgb[3] = {240.0, 237.0, 229.0};
@@ -151,10 +153,10 @@ Page GeneratePage(const PageSpec& spec) {
 
   std::optional<PhotoTexture> texture;
   Placement place{};
-  if (spec.photo) {
-    page.corners = PhotoCorners(*spec.photo);
-    texture.emplace(*spec.photo, random);
-    place = Place(*spec.photo, page.width, page.height);
+  if (recipe.photo) {
+    page.corners = PhotoCorners(*recipe.photo);
+    texture.emplace(*recipe.photo, random);
+    place = Place(*recipe.photo, page.width, page.height);
   }
   Random noise(random.Next());
 
@@ -167,7 +169,7 @@ Page GeneratePage(const PageSpec& spec) {
     paperGrain.FillRow(py, page.width, grainRow.data());
     // Light falls off toward the hinge: a soft band along the top edge.
     double shade = 1.0;
-    if (spec.lidShadow) {
+    if (recipe.lidShadow) {
       const double t = py / 45.0;
       shade = 1.0 - 0.32 / (1.0 + t * t);
     }
@@ -190,18 +192,18 @@ Page GeneratePage(const PageSpec& spec) {
         coverage = cu * cv;
         if (coverage > 0.0) texture->Sample(u + place.halfWidth, v + place.halfHeight, photoRgb);
       }
-      if (spec.color) {
+      if (recipe.color) {
         for (int k = 0; k < 3; ++k) {
           const double mixed = (kPaperRgb[k] + paper) * (1.0 - coverage) + photoRgb[k] * coverage;
-          out[k] = ToByte(mixed * shade + spec.noise * noise.Bell());
+          out[k] = ToByte(mixed * shade + recipe.noise * noise.Bell());
         }
       } else {
         const double photoGray = (photoRgb[0] * 0.3 + photoRgb[1] * 0.59) + photoRgb[2] * 0.11;
         const double mixed = (kPaperGray + paper) * (1.0 - coverage) + photoGray * coverage;
-        out[0] = ToByte(mixed * shade + spec.noise * noise.Bell());
+        out[0] = ToByte(mixed * shade + recipe.noise * noise.Bell());
       }
-      if (spec.alpha) {
-        out[colorChannels] = ToByte(spec.pageAlpha + (255.0 - spec.pageAlpha) * coverage);
+      if (recipe.alpha) {
+        out[colorChannels] = ToByte(recipe.pageAlpha + (255.0 - recipe.pageAlpha) * coverage);
       }
       out += page.channels;
     }

@@ -1,6 +1,6 @@
 // Deterministic synthetic scanned pages: a light paper page with texture,
 // noise and an optional lid shadow, and a textured photo lying on it at a
-// known centre, size and angle. The same spec always gives the same bytes.
+// known centre, size and angle. The same recipe always gives the same bytes.
 #pragma once
 
 #include <array>
@@ -14,7 +14,7 @@ namespace Synth {
 // covers [x, x + 1) x [y, y + 1), so its centre is (x + 0.5, y + 0.5).
 // A positive angle turns the photo counter-clockwise as seen on screen
 // (y grows downward); the analysis reports the same angle with the same sign.
-struct PhotoSpec {
+struct PhotoRecipe {
   double centerX = 0.0;
   double centerY = 0.0;
   double width = 0.0;
@@ -22,13 +22,13 @@ struct PhotoSpec {
   double angleDegrees = 0.0;
 };
 
-struct PageSpec {
+struct PageRecipe {
   int width = 2000;
   int height = 1500;
   bool color = true;        // three channels (RGB) or one (grayscale)
   bool alpha = false;       // add a transparency plane behind the colour channels
   uint8_t pageAlpha = 255;  // transparency of the bare page; the photo is opaque
-  std::optional<PhotoSpec> photo;
+  std::optional<PhotoRecipe> photo;
   bool lidShadow = false;  // a soft shadow along the top edge of the page
   double noise = 2.0;      // standard deviation of the sensor noise, in gray levels
   uint32_t seed = 1;
@@ -46,9 +46,9 @@ struct Page {
 
 // Builds the page. Throws std::invalid_argument for a size below 1 or beyond
 // 65535 a side, or a photo of non-positive or non-finite size.
-Page GeneratePage(const PageSpec& spec);
+Page GeneratePage(const PageRecipe& recipe);
 
 // The corners that GeneratePage reports for a photo, without drawing it.
-std::array<std::array<double, 2>, 4> PhotoCorners(const PhotoSpec& photo);
+std::array<std::array<double, 2>, 4> PhotoCorners(const PhotoRecipe& photo);
 
 }  // namespace Synth

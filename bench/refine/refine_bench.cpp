@@ -108,7 +108,7 @@ void Register() {
   for (const auto kind : kinds) {
     auto page = std::make_unique<BenchPage>();
     page->name = std::string(Synth::HardKindName(kind));
-    page->page = Accuracy::GeneratedCase(Synth::MakeHardPageSpec(kind, 1, 2000, 1500));
+    page->page = Accuracy::GeneratedCase(Synth::MakeHardPageRecipe(kind, 1, 2000, 1500));
     page->answer = Module().Detect(page->page.page.View(), std::nullopt);
     page->options.lid = Refine::SurveyPage(page->page.page.View()).lid;
     Pages().push_back(std::move(page));

@@ -34,34 +34,34 @@ Outcome Detect(const Synth::Page& page, int16_t filterCase = 0) {
   return out;
 }
 
-Synth::PageSpec Spec(int width, int height, bool color, double angle, uint32_t seed) {
-  Synth::PageSpec spec;
-  spec.width = width;
-  spec.height = height;
-  spec.color = color;
-  spec.seed = seed;
+Synth::PageRecipe Recipe(int width, int height, bool color, double angle, uint32_t seed) {
+  Synth::PageRecipe recipe;
+  recipe.width = width;
+  recipe.height = height;
+  recipe.color = color;
+  recipe.seed = seed;
   // Placed a little off centre, differently for each seed.
   const int shiftX = static_cast<int>(seed * 37 % 11) - 5;
   const int shiftY = static_cast<int>(seed * 53 % 11) - 5;
   const double dx = shiftX * 0.01 * width;
   const double dy = shiftY * 0.01 * height;
-  spec.photo =
-      Synth::PhotoSpec{width * 0.5 + dx, height * 0.5 + dy, width * 0.45, height * 0.42, angle};
-  return spec;
+  recipe.photo =
+      Synth::PhotoRecipe{width * 0.5 + dx, height * 0.5 + dy, width * 0.45, height * 0.42, angle};
+  return recipe;
 }
 
-void ExpectFound(const Synth::PageSpec& spec, double cornerTolerance, double angleTolerance,
+void ExpectFound(const Synth::PageRecipe& recipe, double cornerTolerance, double angleTolerance,
                  int16_t filterCase = 0) {
-  const Synth::Page page = Synth::GeneratePage(spec);
+  const Synth::Page page = Synth::GeneratePage(recipe);
   const Outcome out = Detect(page, filterCase);
-  const std::string what = std::to_string(spec.width) + " x " + std::to_string(spec.height) +
-                           (spec.color ? " RGB" : " gray") + " at " +
-                           std::to_string(spec.photo->angleDegrees);
+  const std::string what = std::to_string(recipe.width) + " x " + std::to_string(recipe.height) +
+                           (recipe.color ? " RGB" : " gray") + " at " +
+                           std::to_string(recipe.photo->angleDegrees);
   ASSERT_EQ(out.host.records.size(), 1U) << what;
   EXPECT_FALSE(out.host.records[0].empty) << what;
   EXPECT_EQ(out.result.confidence, 255) << what;
   EXPECT_LE(out.cornerError, cornerTolerance) << what;
-  EXPECT_NEAR(out.result.angle, spec.photo->angleDegrees, angleTolerance) << what;
+  EXPECT_NEAR(out.result.angle, recipe.photo->angleDegrees, angleTolerance) << what;
 }
 
 TEST(ChainTest, PhotosTurnedUpToThirtyDegrees) {
@@ -69,42 +69,42 @@ TEST(ChainTest, PhotosTurnedUpToThirtyDegrees) {
   for (bool color : {true, false}) {
     for (double angle : {-30.0, -25.0, -20.0, -14.0, -9.5, -4.0, -0.5, 0.0, 0.5, 4.0, 10.0, 15.0,
                          19.5, 25.0, 30.0}) {
-      ExpectFound(Spec(1200, 900, color, angle, ++seed), 5.0, 0.5);
+      ExpectFound(Recipe(1200, 900, color, angle, ++seed), 5.0, 0.5);
     }
   }
 }
 
 TEST(ChainTest, FullSizePagesWithALidShadow) {
   for (double angle : {0.0, 12.0, -27.5}) {
-    Synth::PageSpec spec = Spec(2000, 1500, true, angle, 3);
-    spec.lidShadow = true;
-    ExpectFound(spec, 5.0, 0.5);
+    Synth::PageRecipe recipe = Recipe(2000, 1500, true, angle, 3);
+    recipe.lidShadow = true;
+    ExpectFound(recipe, 5.0, 0.5);
   }
 }
 
 TEST(ChainTest, SmallPagesAtOneToThreeDegreesMayCostAFewPixelsMore) {
   // The half-degree vote over short sides: the method, not a fault.
   for (double angle : {-2.75, -1.5, 1.25, 2.0, 3.0}) {
-    ExpectFound(Spec(800, 600, true, angle, 7), 9.0, 1.5);
+    ExpectFound(Recipe(800, 600, true, angle, 7), 9.0, 1.5);
   }
   for (double angle : {-21.0, -6.0, 0.0, 8.0, 28.0}) {
-    ExpectFound(Spec(800, 600, false, angle, 8), 5.0, 0.5);
+    ExpectFound(Recipe(800, 600, false, angle, 8), 5.0, 0.5);
   }
 }
 
 TEST(ChainTest, TransparentPageAroundThePhotoInFilterCases4And5) {
   for (int16_t filterCase : {4, 5}) {
-    Synth::PageSpec spec = Spec(1200, 900, true, -17.0, 21);
-    spec.alpha = true;
-    spec.pageAlpha = 0;
-    ExpectFound(spec, 5.0, 0.5, filterCase);
+    Synth::PageRecipe recipe = Recipe(1200, 900, true, -17.0, 21);
+    recipe.alpha = true;
+    recipe.pageAlpha = 0;
+    ExpectFound(recipe, 5.0, 0.5, filterCase);
   }
 }
 
 TEST(ChainTest, BlankPageIsFlat) {
-  Synth::PageSpec spec = Spec(1200, 900, true, 0.0, 4);
-  spec.photo.reset();
-  const Outcome out = Detect(Synth::GeneratePage(spec));
+  Synth::PageRecipe recipe = Recipe(1200, 900, true, 0.0, 4);
+  recipe.photo.reset();
+  const Outcome out = Detect(Synth::GeneratePage(recipe));
   ASSERT_EQ(out.host.records.size(), 1U);
   ASSERT_FALSE(out.host.records[0].empty);
   EXPECT_EQ(out.host.records[0].confidence, 0);
@@ -115,10 +115,10 @@ TEST(ChainTest, BlankPageIsFlat) {
 TEST(ChainTest, BlankPageUnderALidShadowFindsNothing) {
   // The shadow makes the top rows dark (touching the top border), but there
   // is no outline to find: the failure record.
-  Synth::PageSpec spec = Spec(1200, 900, false, 0.0, 5);
-  spec.photo.reset();
-  spec.lidShadow = true;
-  const Outcome out = Detect(Synth::GeneratePage(spec));
+  Synth::PageRecipe recipe = Recipe(1200, 900, false, 0.0, 5);
+  recipe.photo.reset();
+  recipe.lidShadow = true;
+  const Outcome out = Detect(Synth::GeneratePage(recipe));
   ASSERT_EQ(out.host.records.size(), 1U);
   EXPECT_TRUE(out.host.records[0].empty);
 }

@@ -51,12 +51,12 @@ void DrawInside(TestFrame& frame) {
 }
 
 Synth::Page PhotoPage(int width, int height, double angle, bool color = true) {
-  Synth::PageSpec spec;
-  spec.width = width;
-  spec.height = height;
-  spec.color = color;
-  spec.photo = Synth::PhotoSpec{width * 0.5, height * 0.45, width * 0.45, height * 0.4, angle};
-  return Synth::GeneratePage(spec);
+  Synth::PageRecipe recipe;
+  recipe.width = width;
+  recipe.height = height;
+  recipe.color = color;
+  recipe.photo = Synth::PhotoRecipe{width * 0.5, height * 0.45, width * 0.45, height * 0.4, angle};
+  return Synth::GeneratePage(recipe);
 }
 
 TEST(DriverTest, ParametersFollowTheSmallerSide) {
@@ -223,13 +223,13 @@ TEST(DriverTest, BufferLayoutDoesNotChangeTheResult) {
 }
 
 TEST(DriverTest, TransparentPageAroundAnOpaquePhotoInFilterCases4And5) {
-  Synth::PageSpec spec;
-  spec.width = 400;
-  spec.height = 300;
-  spec.alpha = true;
-  spec.pageAlpha = 0;
-  spec.photo = Synth::PhotoSpec{210, 140, 180, 120, -9.0};
-  const Synth::Page page = Synth::GeneratePage(spec);
+  Synth::PageRecipe recipe;
+  recipe.width = 400;
+  recipe.height = 300;
+  recipe.alpha = true;
+  recipe.pageAlpha = 0;
+  recipe.photo = Synth::PhotoRecipe{210, 140, 180, 120, -9.0};
+  const Synth::Page page = Synth::GeneratePage(recipe);
   for (int16_t filterCase : {4, 5}) {
     TestFrame frame(page);
     frame.View().filterCase = filterCase;

@@ -99,11 +99,11 @@ TEST(EdgeMapTest, TransparencyIsNotPartOfTheSum) {
 }
 
 TEST(EdgeMapTest, OutputBufferAndOtherPlanesStayUnchanged) {
-  Synth::PageSpec spec;
-  spec.width = 120;
-  spec.height = 90;
-  spec.photo = Synth::PhotoSpec{60, 45, 60, 40, 7};
-  TestFrame frame(Synth::GeneratePage(spec));
+  Synth::PageRecipe recipe;
+  recipe.width = 120;
+  recipe.height = 90;
+  recipe.photo = Synth::PhotoRecipe{60, 45, 60, 40, 7};
+  TestFrame frame(Synth::GeneratePage(recipe));
   const std::vector<uint8_t> output = frame.Output().Storage();
   const std::vector<uint8_t> input = frame.Input().Storage();
   CountingHost host;

@@ -11,7 +11,7 @@ namespace AnalysisTest {
 
 struct GoldenPage {
   const char* name;
-  Synth::PageSpec spec;
+  Synth::PageRecipe recipe;
   int16_t filterCase;
 };
 

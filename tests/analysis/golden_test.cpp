@@ -77,7 +77,7 @@ TEST(GoldenTest, StagesAndRecordOfFixedPages) {
     const Golden& g = goldens[i];
     const char* const name = pages[i].name;
     const int16_t filterCase = pages[i].filterCase;
-    const Synth::Page page = Synth::GeneratePage(pages[i].spec);
+    const Synth::Page page = Synth::GeneratePage(pages[i].recipe);
 
     // The first half and the edge search, stage by stage.
     TestFrame traced(page);

@@ -419,7 +419,7 @@ TEST_P(LiteralEqualityTest, WholeRunsOnRandomFrames) {
 TEST_P(LiteralEqualityTest, WholeRunsOnGoldenPages) {
   for (const AnalysisTest::GoldenPage& golden : AnalysisTest::GoldenPages()) {
     SCOPED_TRACE(golden.name);
-    const Synth::Page page = Synth::GeneratePage(golden.spec);
+    const Synth::Page page = Synth::GeneratePage(golden.recipe);
     for (const AnalysisTest::Layout layout :
          {AnalysisTest::Layout{}, AnalysisTest::Layout{5, 1, true}}) {
       TestFrame mine(page, layout);

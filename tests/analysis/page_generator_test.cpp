@@ -12,17 +12,17 @@ namespace {
 
 using Synth::GeneratePage;
 using Synth::Page;
-using Synth::PageSpec;
-using Synth::PhotoSpec;
+using Synth::PageRecipe;
+using Synth::PhotoRecipe;
 
-PageSpec Small(bool color, bool alpha = false) {
-  PageSpec spec;
-  spec.width = 240;
-  spec.height = 180;
-  spec.color = color;
-  spec.alpha = alpha;
-  spec.photo = PhotoSpec{120, 90, 100, 70, 15};
-  return spec;
+PageRecipe Small(bool color, bool alpha = false) {
+  PageRecipe recipe;
+  recipe.width = 240;
+  recipe.height = 180;
+  recipe.color = color;
+  recipe.alpha = alpha;
+  recipe.photo = PhotoRecipe{120, 90, 100, 70, 15};
+  return recipe;
 }
 
 uint8_t At(const Page& page, int x, int y, int k) {
@@ -52,11 +52,11 @@ TEST(PageGeneratorTest, SizeAndChannels) {
   }
 }
 
-TEST(PageGeneratorTest, SameSpecSameBytesOtherSeedOtherBytes) {
+TEST(PageGeneratorTest, SameRecipeSameBytesOtherSeedOtherBytes) {
   const Page a = GeneratePage(Small(true));
   const Page b = GeneratePage(Small(true));
   EXPECT_EQ(a.pixels, b.pixels);
-  PageSpec other = Small(true);
+  PageRecipe other = Small(true);
   other.seed = 2;
   EXPECT_NE(GeneratePage(other).pixels, a.pixels);
 }
@@ -64,7 +64,7 @@ TEST(PageGeneratorTest, SameSpecSameBytesOtherSeedOtherBytes) {
 TEST(PageGeneratorTest, BytesAreTheSameOnEveryPlatform) {
   // Fixed fingerprints: a change here changes every golden analysis result.
   EXPECT_EQ(Fingerprint(GeneratePage(Small(true))), 0x2b45bbb4d4156a63ULL);
-  PageSpec gray = Small(false, true);
+  PageRecipe gray = Small(false, true);
   gray.lidShadow = true;
   gray.pageAlpha = 40;
   EXPECT_EQ(Fingerprint(GeneratePage(gray)), 0x76234544492a0d50ULL);
@@ -83,7 +83,7 @@ TEST(PageGeneratorTest, CornersOfATurnedPhoto) {
   EXPECT_NEAR(std::atan2(-(c[1][1] - c[0][1]), c[1][0] - c[0][0]) * 180.0 / std::numbers::pi, 15.0,
               1e-9);
 
-  const auto upright = Synth::PhotoCorners(PhotoSpec{50, 40, 20, 10, 0});
+  const auto upright = Synth::PhotoCorners(PhotoRecipe{50, 40, 20, 10, 0});
   EXPECT_DOUBLE_EQ(upright[0][0], 40.0);
   EXPECT_DOUBLE_EQ(upright[0][1], 35.0);
   EXPECT_DOUBLE_EQ(upright[2][0], 60.0);
@@ -91,38 +91,38 @@ TEST(PageGeneratorTest, CornersOfATurnedPhoto) {
 }
 
 TEST(PageGeneratorTest, BlankPageReportsItsOwnCorners) {
-  PageSpec spec = Small(false);
-  spec.photo.reset();
-  const Page page = GeneratePage(spec);
+  PageRecipe recipe = Small(false);
+  recipe.photo.reset();
+  const Page page = GeneratePage(recipe);
   EXPECT_EQ(page.corners[2][0], 240.0);
   EXPECT_EQ(page.corners[2][1], 180.0);
   for (size_t i = 0; i < page.pixels.size(); ++i) ASSERT_GE(page.pixels[i], 200) << i;
 }
 
 TEST(PageGeneratorTest, PhotoIsDarkPaperLightEdgesAntialiased) {
-  PageSpec spec = Small(false);
-  spec.photo = PhotoSpec{120, 90, 100, 70, 0};
-  spec.noise = 0.0;
-  const Page page = GeneratePage(spec);
+  PageRecipe recipe = Small(false);
+  recipe.photo = PhotoRecipe{120, 90, 100, 70, 0};
+  recipe.noise = 0.0;
+  const Page page = GeneratePage(recipe);
   EXPECT_LE(At(page, 120, 90, 0), 175);
   EXPECT_GE(At(page, 20, 20, 0), 220);
   // The photo spans x 70 ... 170: pixel 69 is paper, 70 photo. Half a pixel
   // off, the edge pixel mixes both.
-  spec.photo->centerX = 120.5;
-  const Page shifted = GeneratePage(spec);
+  recipe.photo->centerX = 120.5;
+  const Page shifted = GeneratePage(recipe);
   const int edge = At(shifted, 70, 90, 0);
   EXPECT_GT(edge, At(shifted, 71, 90, 0) + 20);
   EXPECT_LT(edge, At(shifted, 69, 90, 0) - 20);
 }
 
 TEST(PageGeneratorTest, TransparencyPlaneAndLidShadow) {
-  PageSpec spec = Small(true, true);
-  spec.pageAlpha = 30;
-  spec.lidShadow = true;
-  const Page page = GeneratePage(spec);
+  PageRecipe recipe = Small(true, true);
+  recipe.pageAlpha = 30;
+  recipe.lidShadow = true;
+  const Page page = GeneratePage(recipe);
   EXPECT_EQ(At(page, 5, 170, 3), 30);
   EXPECT_EQ(At(page, 120, 90, 3), 255);
-  PageSpec plain = spec;
+  PageRecipe plain = recipe;
   plain.lidShadow = false;
   const Page light = GeneratePage(plain);
   EXPECT_LT(At(page, 10, 0, 1) + 40, At(light, 10, 0, 1));
@@ -131,20 +131,20 @@ TEST(PageGeneratorTest, TransparencyPlaneAndLidShadow) {
   EXPECT_GT(At(page, 10, 170, 1) + 8, At(light, 10, 170, 1));
 }
 
-TEST(PageGeneratorTest, BadSpecsAreRefused) {
-  PageSpec zero = Small(true);
+TEST(PageGeneratorTest, BadRecipesAreRefused) {
+  PageRecipe zero = Small(true);
   zero.width = 0;
   EXPECT_THROW(GeneratePage(zero), std::invalid_argument);
-  PageSpec huge = Small(true);
+  PageRecipe huge = Small(true);
   huge.height = 70000;
   EXPECT_THROW(GeneratePage(huge), std::invalid_argument);
-  PageSpec flatPhoto = Small(true);
+  PageRecipe flatPhoto = Small(true);
   flatPhoto.photo->height = 0;
   EXPECT_THROW(GeneratePage(flatPhoto), std::invalid_argument);
-  PageSpec nan = Small(true);
+  PageRecipe nan = Small(true);
   nan.photo->angleDegrees = std::nan("");
   EXPECT_THROW(GeneratePage(nan), std::invalid_argument);
-  PageSpec noisy = Small(true);
+  PageRecipe noisy = Small(true);
   noisy.noise = -1;
   EXPECT_THROW(GeneratePage(noisy), std::invalid_argument);
 }

@@ -119,13 +119,13 @@ TEST(ProfilesTest, LayoutDoesNotChangeAnyBit) {
   const Layout layouts[] = {{}, {13, 0, false}, {0, 2, false}, {7, 1, true}, {0, 0, true}};
   std::vector<double> reference;
   for (const Layout& layout : layouts) {
-    Synth::PageSpec spec;
-    spec.width = 90;
-    spec.height = 70;
-    spec.alpha = true;
-    spec.pageAlpha = 120;
-    spec.photo = Synth::PhotoSpec{45, 35, 40, 30, 10};
-    TestFrame frame(Synth::GeneratePage(spec), layout);
+    Synth::PageRecipe recipe;
+    recipe.width = 90;
+    recipe.height = 70;
+    recipe.alpha = true;
+    recipe.pageAlpha = 120;
+    recipe.photo = Synth::PhotoRecipe{45, 35, 40, 30, 10};
+    TestFrame frame(Synth::GeneratePage(recipe), layout);
     frame.View().filterCase = 5;
     CountingHost host;
     Profiles p = RunProfiles(frame, host);

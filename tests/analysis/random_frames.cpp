@@ -72,19 +72,20 @@ void Put(TestFrame& frame, int32_t x, int32_t y, int32_t k, uint8_t value) {
 }
 
 void PaintPage(TestFrame& frame, const FrameCase& c, Random& r) {
-  Synth::PageSpec spec;
-  spec.width = c.width;
-  spec.height = c.height;
-  spec.color = c.colorPlanes >= 3;
-  spec.alpha = c.alpha;
-  spec.pageAlpha = static_cast<uint8_t>(r.Between(0, 255));
-  spec.lidShadow = r.Chance(30);
-  spec.noise = r.Unit() * 6.0;
-  spec.seed = static_cast<uint32_t>(r.Next());
-  spec.photo = Synth::PhotoSpec{c.width * (0.3 + 0.4 * r.Unit()), c.height * (0.3 + 0.4 * r.Unit()),
-                                c.width * (0.2 + 0.7 * r.Unit()), c.height * (0.2 + 0.7 * r.Unit()),
-                                -50.0 + 100.0 * r.Unit()};
-  const Synth::Page page = Synth::GeneratePage(spec);
+  Synth::PageRecipe recipe;
+  recipe.width = c.width;
+  recipe.height = c.height;
+  recipe.color = c.colorPlanes >= 3;
+  recipe.alpha = c.alpha;
+  recipe.pageAlpha = static_cast<uint8_t>(r.Between(0, 255));
+  recipe.lidShadow = r.Chance(30);
+  recipe.noise = r.Unit() * 6.0;
+  recipe.seed = static_cast<uint32_t>(r.Next());
+  recipe.photo =
+      Synth::PhotoRecipe{c.width * (0.3 + 0.4 * r.Unit()), c.height * (0.3 + 0.4 * r.Unit()),
+                         c.width * (0.2 + 0.7 * r.Unit()), c.height * (0.2 + 0.7 * r.Unit()),
+                         -50.0 + 100.0 * r.Unit()};
+  const Synth::Page page = Synth::GeneratePage(recipe);
   const int32_t pagePlanes = page.channels;
   const int32_t pageColors = c.alpha ? pagePlanes - 1 : pagePlanes;
   for (int32_t y = 0; y < c.height; ++y) {

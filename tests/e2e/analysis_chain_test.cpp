@@ -36,13 +36,13 @@ class MemoryHost : public Project::AnalysisHost {
 };
 
 // The chain over the whole page, laid out as the host delivers it.
-void RunChain(const Synth::Page& page, const Synth::PageSpec& spec, Project::AnalysisResult& result,
-              std::array<int16_t, 9>& record) {
+void RunChain(const Synth::Page& page, const Synth::PageRecipe& recipe,
+              Project::AnalysisResult& result, std::array<int16_t, 9>& record) {
   std::vector<uint8_t> input = page.pixels;
   std::vector<uint8_t> output = page.pixels;
   Project::FrameView frame;
-  frame.imageMode = spec.color ? 3 : 1;
-  frame.filterCase = spec.alpha ? 4 : 1;
+  frame.imageMode = recipe.color ? 3 : 1;
+  frame.filterCase = recipe.alpha ? 4 : 1;
   frame.planes = static_cast<int16_t>(page.channels);
   frame.documentRows = static_cast<int16_t>(page.height);
   frame.documentColumns = static_cast<int16_t>(page.width);
@@ -68,7 +68,7 @@ uint64_t Bits(double value) {
 using AnalysisChain = E2E::ModuleTest;
 
 TEST_F(AnalysisChain, ModuleAnswersExactlyWhatTheChainComputes) {
-  std::vector<Synth::PageSpec> pages = {
+  std::vector<Synth::PageRecipe> pages = {
       E2E::PhotoPage(900, 700, 11.0, 3), E2E::PhotoPage(700, 900, -23.5, 4),
       E2E::BlankPage(600, 400, 5),       E2E::PhotoPage(1200, 800, 0.0, 6),
       E2E::PhotoPage(500, 500, 35.0, 7),
@@ -76,7 +76,7 @@ TEST_F(AnalysisChain, ModuleAnswersExactlyWhatTheChainComputes) {
   pages[1].color = false;
   pages[3].alpha = true;
   pages[4].lidShadow = true;
-  Synth::PageSpec edge = E2E::PhotoPage(800, 600, 2.0, 8);
+  Synth::PageRecipe edge = E2E::PhotoPage(800, 600, 2.0, 8);
   edge.photo->centerX = 180;  // the photo runs off the left side
   pages.push_back(edge);
 

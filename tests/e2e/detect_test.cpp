@@ -7,24 +7,25 @@ namespace {
 
 using DetectModule = E2E::ModuleTest;
 
-Standin::PageView View(const Synth::Page& page, const Synth::PageSpec& spec) {
-  return {page.width, page.height,        spec.color ? 3 : 1,
-          spec.alpha, page.pixels.data(), static_cast<std::ptrdiff_t>(page.width) * page.channels};
+Standin::PageView View(const Synth::Page& page, const Synth::PageRecipe& recipe) {
+  return {page.width,           page.height,
+          recipe.color ? 3 : 1, recipe.alpha,
+          page.pixels.data(),   static_cast<std::ptrdiff_t>(page.width) * page.channels};
 }
 
 TEST_F(DetectModule, AnswersLikeAWholeRunOfTheHost) {
   for (bool color : {true, false}) {
     for (bool alpha : {false, true}) {
-      Synth::PageSpec spec = E2E::PhotoPage(640, 480, color ? -14.0 : 21.0, 31);
-      spec.color = color;
-      spec.alpha = alpha;
-      Synth::Page page = Synth::GeneratePage(spec);
-      Standin::Detection detection = Standin::Detect(*module_, View(page, spec));
+      Synth::PageRecipe recipe = E2E::PhotoPage(640, 480, color ? -14.0 : 21.0, 31);
+      recipe.color = color;
+      recipe.alpha = alpha;
+      Synth::Page page = Synth::GeneratePage(recipe);
+      Standin::Detection detection = Standin::Detect(*module_, View(page, recipe));
       EXPECT_EQ(detection.error, "");
       ASSERT_TRUE(detection.recordPresent);
       ASSERT_TRUE(detection.descriptorPresent);
 
-      auto host = MakeHost(E2E::PageDocument(spec));
+      auto host = MakeHost(E2E::PageDocument(recipe));
       host->Run();
       ASSERT_EQ(E2E::RecordValues(*host).size(), 1u);
       EXPECT_EQ(detection.record, E2E::RecordValues(*host)[0]);
@@ -36,11 +37,11 @@ TEST_F(DetectModule, AnswersLikeAWholeRunOfTheHost) {
 }
 
 TEST_F(DetectModule, FilterRectangleMovesTheCornersIntoPageCoordinates) {
-  Synth::PageSpec spec = E2E::PhotoPage(700, 500, 5.0, 32);
-  Synth::Page page = Synth::GeneratePage(spec);
-  Standin::Detection whole = Standin::Detect(*module_, View(page, spec));
+  Synth::PageRecipe recipe = E2E::PhotoPage(700, 500, 5.0, 32);
+  Synth::Page page = Synth::GeneratePage(recipe);
+  Standin::Detection whole = Standin::Detect(*module_, View(page, recipe));
   Standin::Detection part = Standin::Detect(
-      *module_, View(page, spec), {.filterRect = std::array<int32_t, 4>{20, 40, 490, 690}});
+      *module_, View(page, recipe), {.filterRect = std::array<int32_t, 4>{20, 40, 490, 690}});
   EXPECT_EQ(part.error, "");
   EXPECT_EQ(part.confidence, 255);
   for (size_t i = 0; i < 8; ++i) {

@@ -36,29 +36,29 @@ std::string ModulePath() {
   return Portable(FRINGE_MODULE_PATH);
 }
 
-Standin::Document PageDocument(const Synth::PageSpec& spec) {
-  Synth::Page page = Synth::GeneratePage(spec);
-  Standin::Document document(page.width, page.height, spec.color ? 3 : 1, spec.alpha);
+Standin::Document PageDocument(const Synth::PageRecipe& recipe) {
+  Synth::Page page = Synth::GeneratePage(recipe);
+  Standin::Document document(page.width, page.height, recipe.color ? 3 : 1, recipe.alpha);
   std::ptrdiff_t rowBytes = static_cast<std::ptrdiff_t>(page.width) * page.channels;
   document.SetPixels(std::move(page.pixels), rowBytes);
   return document;
 }
 
-Synth::PageSpec PhotoPage(int width, int height, double angle, uint32_t seed) {
-  Synth::PageSpec spec;
-  spec.width = width;
-  spec.height = height;
-  spec.photo = Synth::PhotoSpec{width * 0.5, height * 0.5, width * 0.55, height * 0.5, angle};
-  spec.seed = seed;
-  return spec;
+Synth::PageRecipe PhotoPage(int width, int height, double angle, uint32_t seed) {
+  Synth::PageRecipe recipe;
+  recipe.width = width;
+  recipe.height = height;
+  recipe.photo = Synth::PhotoRecipe{width * 0.5, height * 0.5, width * 0.55, height * 0.5, angle};
+  recipe.seed = seed;
+  return recipe;
 }
 
-Synth::PageSpec BlankPage(int width, int height, uint32_t seed) {
-  Synth::PageSpec spec;
-  spec.width = width;
-  spec.height = height;
-  spec.seed = seed;
-  return spec;
+Synth::PageRecipe BlankPage(int width, int height, uint32_t seed) {
+  Synth::PageRecipe recipe;
+  recipe.width = width;
+  recipe.height = height;
+  recipe.seed = seed;
+  return recipe;
 }
 
 std::vector<std::array<int16_t, 9>> RecordValues(const Standin::Host& host) {

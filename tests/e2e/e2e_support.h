@@ -21,11 +21,11 @@ constexpr uint32_t kRecordType = 0x66524E47;  // 'fRNG'
 std::string ModulePath();
 
 // A document holding the generated page's pixels.
-Standin::Document PageDocument(const Synth::PageSpec& spec);
+Standin::Document PageDocument(const Synth::PageRecipe& recipe);
 // An RGB page with a photo well inside it, turned by `angle`.
-Synth::PageSpec PhotoPage(int width, int height, double angle, uint32_t seed = 1);
+Synth::PageRecipe PhotoPage(int width, int height, double angle, uint32_t seed = 1);
 // The same without a photo.
-Synth::PageSpec BlankPage(int width, int height, uint32_t seed = 1);
+Synth::PageRecipe BlankPage(int width, int height, uint32_t seed = 1);
 
 // The record values (9) of each 'fRNG' record the document holds.
 std::vector<std::array<int16_t, 9>> RecordValues(const Standin::Host& host);

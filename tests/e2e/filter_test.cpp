@@ -210,8 +210,8 @@ TEST_F(Filter, FlatPageGivesTheWholePageAndKeepsThePreviousAngle) {
 }
 
 TEST_F(Filter, CornersComeBackInDocumentCoordinates) {
-  Synth::PageSpec spec = E2E::PhotoPage(600, 450, -5.0);
-  auto plain = MakeHost(E2E::PageDocument(spec));
+  Synth::PageRecipe recipe = E2E::PhotoPage(600, 450, -5.0);
+  auto plain = MakeHost(E2E::PageDocument(recipe));
   plain->Run();
   ASSERT_EQ(RecordValues(*plain).size(), 1u);
   std::array<int16_t, 9> expected = RecordValues(*plain)[0];
@@ -222,7 +222,7 @@ TEST_F(Filter, CornersComeBackInDocumentCoordinates) {
   double angle = *plain->LastDescriptor()->Float(FourCC("angl"));
 
   // The same page inside a larger document, selected from top 50, left 30.
-  Synth::Page page = Synth::GeneratePage(spec);
+  Synth::Page page = Synth::GeneratePage(recipe);
   Standin::Document document(600 + 80, 450 + 90, 3);
   std::vector<uint8_t> pixels(static_cast<size_t>(680 * 540 * 3), 255);
   for (int y = 0; y < 450; ++y) {

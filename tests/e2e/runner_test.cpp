@@ -71,7 +71,7 @@ TEST(PageSets, SweepIsDrawnTheSameWayEveryTime) {
     ASSERT_EQ(first[i].photo.has_value(), again[i].photo.has_value());
     if (first[i].photo) {
       ++photos;
-      EXPECT_EQ(std::memcmp(&*first[i].photo, &*again[i].photo, sizeof(Synth::PhotoSpec)), 0);
+      EXPECT_EQ(std::memcmp(&*first[i].photo, &*again[i].photo, sizeof(Synth::PhotoRecipe)), 0);
       EXPECT_GE(first[i].photo->angleDegrees, -40.0);
       EXPECT_LT(first[i].photo->angleDegrees, 40.0);
     }

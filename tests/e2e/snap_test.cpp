@@ -17,13 +17,13 @@ class Snapping : public ModuleTest {
  protected:
   // The record of an upright photo whose top-left corner lies at (left, top).
   std::array<int16_t, 9> RecordFor(double left, double top) {
-    Synth::PageSpec spec;
-    spec.width = kWidth;
-    spec.height = kHeight;
-    spec.noise = 1.0;
-    spec.photo = Synth::PhotoSpec{left + kPhotoWidth / 2, top + kPhotoHeight / 2, kPhotoWidth,
-                                  kPhotoHeight, 0.0};
-    auto host = MakeHost(E2E::PageDocument(spec));
+    Synth::PageRecipe recipe;
+    recipe.width = kWidth;
+    recipe.height = kHeight;
+    recipe.noise = 1.0;
+    recipe.photo = Synth::PhotoRecipe{left + kPhotoWidth / 2, top + kPhotoHeight / 2, kPhotoWidth,
+                                      kPhotoHeight, 0.0};
+    auto host = MakeHost(E2E::PageDocument(recipe));
     host->Run();
     ExpectClean(*host);
     auto records = E2E::RecordValues(*host);

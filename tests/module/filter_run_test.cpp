@@ -72,11 +72,11 @@ class FilterRunTest : public ::testing::Test {
   }
 
   static Synth::Page PhotoPage(int width, int height, double angle) {
-    Synth::PageSpec spec;
-    spec.width = width;
-    spec.height = height;
-    spec.photo = Synth::PhotoSpec{width * 0.5, height * 0.5, width * 0.5, height * 0.45, angle};
-    return Synth::GeneratePage(spec);
+    Synth::PageRecipe recipe;
+    recipe.width = width;
+    recipe.height = height;
+    recipe.photo = Synth::PhotoRecipe{width * 0.5, height * 0.5, width * 0.5, height * 0.45, angle};
+    return Synth::GeneratePage(recipe);
   }
 
   FringeTest::AlertCapture alerts_;
@@ -252,7 +252,7 @@ TEST_F(FilterRunTest, AFlatPageKeepsThePreviousAngle) {
   const double angle = host_.descriptor.at(0).floatValue;
   ASSERT_NE(angle, 0.0);
 
-  Synth::PageSpec blank;
+  Synth::PageRecipe blank;
   blank.width = 200;
   blank.height = 150;
   LoadPage(Synth::GeneratePage(blank));

@@ -21,10 +21,10 @@ class RefineCli : public ::testing::Test {
  protected:
   void SetUp() override { EnsureVips(); }
 
-  std::string WriteHardPage(const std::string& name, const Synth::HardPageSpec& spec) {
-    hard_ = Synth::GenerateHardPage(spec);
+  std::string WriteHardPage(const std::string& name, const Synth::HardPageRecipe& recipe) {
+    hard_ = Synth::GenerateHardPage(recipe);
     const std::string path = tmp_ / name;
-    WritePage(hard_.page, path, spec.color ? Layout::Rgb : Layout::Gray);
+    WritePage(hard_.page, path, recipe.color ? Layout::Rgb : Layout::Gray);
     return path;
   }
 
@@ -61,7 +61,7 @@ class RefineCli : public ::testing::Test {
 
 TEST_F(RefineCli, JsonKeepsTheModulesAnswerBesideTheRefinedOne) {
   const std::string page = WriteHardPage(
-      "border.png", Synth::MakeHardPageSpec(Synth::HardKind::kWhiteBorder, 2, 1200, 900));
+      "border.png", Synth::MakeHardPageRecipe(Synth::HardKind::kWhiteBorder, 2, 1200, 900));
   const nlohmann::json refined = OnlyLine(Fringe({"detect", "--json", page}));
   const nlohmann::json raw = OnlyLine(Fringe({"detect", "--json", "--raw", page}));
   // The module's own fields are the same with and without refinement, the angle to the bit.
@@ -87,8 +87,8 @@ TEST_F(RefineCli, JsonKeepsTheModulesAnswerBesideTheRefinedOne) {
 }
 
 TEST_F(RefineCli, CropFollowsThePaperOrThePictureInsideItsMargin) {
-  const auto spec = Synth::MakeHardPageSpec(Synth::HardKind::kWhiteBorder, 3, 1200, 900);
-  const std::string page = WriteHardPage("border.png", spec);
+  const auto recipe = Synth::MakeHardPageRecipe(Synth::HardKind::kWhiteBorder, 3, 1200, 900);
+  const std::string page = WriteHardPage("border.png", recipe);
   const auto paperLine =
       OnlyLine(Fringe({"crop", "--json", "--format", "png", page, "-o", tmp_ / "paper"}));
   const auto pictureLine = OnlyLine(Fringe(
@@ -120,7 +120,7 @@ TEST_F(RefineCli, CropFollowsThePaperOrThePictureInsideItsMargin) {
 
 TEST_F(RefineCli, OutlinePictureIsDrawnOnTheRefinedOutline) {
   const std::string page = WriteHardPage(
-      "band.png", Synth::MakeHardPageSpec(Synth::HardKind::kShadowBand, 3, 1000, 750));
+      "band.png", Synth::MakeHardPageRecipe(Synth::HardKind::kShadowBand, 3, 1000, 750));
   const auto line =
       OnlyLine(Fringe({"draw", "--json", "--outline-format", "png", page, "-o", tmp_ / "out"}));
   const vips::VImage drawn =
@@ -142,10 +142,10 @@ TEST_F(RefineCli, OutlinePictureIsDrawnOnTheRefinedOutline) {
 }
 
 TEST_F(RefineCli, PreparationsAreReported) {
-  auto spec = Synth::MakeHardPageSpec(Synth::HardKind::kBedStrip, 1, 1200, 900);
-  spec.bedStripSide = 0;
-  spec.bedStripWidth = 30.0;
-  const std::string page = WriteHardPage("strip.png", spec);
+  auto recipe = Synth::MakeHardPageRecipe(Synth::HardKind::kBedStrip, 1, 1200, 900);
+  recipe.bedStripSide = 0;
+  recipe.bedStripWidth = 30.0;
+  const std::string page = WriteHardPage("strip.png", recipe);
   const auto line = OnlyLine(Fringe({"detect", "--json", page}));
   const auto& r = line["refined"];
   ASSERT_EQ(r["preparations"].size(), 1u) << r.dump();
@@ -164,7 +164,7 @@ TEST_F(RefineCli, PreparationsAreReported) {
 TEST_F(RefineCli, NothingOnThePageOverridesTheModulesFalsePhoto) {
   // A blank page on which the module reports a photo.
   const std::string page = WriteHardPage(
-      "blank.png", Synth::MakeHardPageSpec(Synth::HardKind::kBlank, 7933, 2000, 1500));
+      "blank.png", Synth::MakeHardPageRecipe(Synth::HardKind::kBlank, 7933, 2000, 1500));
   const RunOutcome raw = Fringe({"detect", "--json", "--raw", page});
   if (OnlyLine(raw)["status"] != "found")
     GTEST_SKIP() << "the module reports no photo on this page";
@@ -183,7 +183,7 @@ TEST_F(RefineCli, WorkersGiveTheSameRefinedResults) {
   for (const auto kind : kinds) {
     std::string name(Synth::HardKindName(kind));
     name += ".png";
-    pages.push_back(WriteHardPage(name, Synth::MakeHardPageSpec(kind, 4, 900, 700)));
+    pages.push_back(WriteHardPage(name, Synth::MakeHardPageRecipe(kind, 4, 900, 700)));
   }
   std::vector<std::string> one{"detect", "--json", "-q", "-j", "1"},
       two{"detect", "--json", "-q", "-j", "2"};

@@ -29,7 +29,7 @@ TEST(ModuleAnswer, RawAnswerIsWhatTheModulePublished) {
   const Synth::HardKind kinds[] = {Synth::HardKind::kBedStrip, Synth::HardKind::kShadowBand,
                                    Synth::HardKind::kBlank};
   for (const auto kind : kinds) {
-    const PageCase c = GeneratedCase(Synth::MakeHardPageSpec(kind, 2, 1000, 750));
+    const PageCase c = GeneratedCase(Synth::MakeHardPageRecipe(kind, 2, 1000, 750));
     ModuleDetector detector(FRINGE_TEST_MODULE);
     const Refine::PipelineResult result = Refine::DetectAndRefine(detector, c.page.View());
     const Standin::Detection d = Direct(c.page);
@@ -53,7 +53,7 @@ TEST(ModuleAnswer, RawAnswerIsWhatTheModulePublished) {
 
 TEST(ModuleAnswer, PreparedRunUsesThePagesCoordinates) {
   const PageCase c =
-      GeneratedCase(Synth::MakeHardPageSpec(Synth::HardKind::kBedStrip, 3, 1000, 750));
+      GeneratedCase(Synth::MakeHardPageRecipe(Synth::HardKind::kBedStrip, 3, 1000, 750));
   ModuleDetector detector(FRINGE_TEST_MODULE);
   const Refine::PipelineResult result = Refine::DetectAndRefine(detector, c.page.View());
   ASSERT_TRUE(result.prepared);

@@ -20,10 +20,11 @@ PageImage ViewOf(const Synth::Page& page) {
 
 TEST(PagePrep, FindsABedStripOnEachEdge) {
   for (int edge = 0; edge < 4; ++edge) {
-    Synth::HardPageSpec spec = Synth::MakeHardPageSpec(Synth::HardKind::kBedStrip, 7, 1000, 760);
-    spec.bedStripSide = edge;
-    spec.bedStripWidth = 33.0;
-    const Synth::HardPage hard = Synth::GenerateHardPage(spec);
+    Synth::HardPageRecipe recipe =
+        Synth::MakeHardPageRecipe(Synth::HardKind::kBedStrip, 7, 1000, 760);
+    recipe.bedStripSide = edge;
+    recipe.bedStripWidth = 33.0;
+    const Synth::HardPage hard = Synth::GenerateHardPage(recipe);
     const PageSurvey survey = SurveyPage(ViewOf(hard.page));
     for (int e = 0; e < 4; ++e) {
       if (e == edge) {
@@ -54,7 +55,7 @@ TEST(PagePrep, NoStripWhereThereIsNone) {
   for (const auto kind : kinds) {
     for (uint32_t seed = 1; seed <= 3; ++seed) {
       const Synth::HardPage hard =
-          Synth::GenerateHardPage(Synth::MakeHardPageSpec(kind, seed, 900, 700));
+          Synth::GenerateHardPage(Synth::MakeHardPageRecipe(kind, seed, 900, 700));
       const PreparedPage prepared = PreparePage(ViewOf(hard.page));
       EXPECT_FALSE(prepared.filterRect) << Synth::HardKindName(kind) << " " << seed;
       EXPECT_TRUE(prepared.steps.empty()) << Synth::HardKindName(kind) << " " << seed;
@@ -64,11 +65,12 @@ TEST(PagePrep, NoStripWhereThereIsNone) {
 }
 
 TEST(PagePrep, MeasuresNoiseAndSmoothsOnlyHeavyNoise) {
-  Synth::HardPageSpec spec = Synth::MakeHardPageSpec(Synth::HardKind::kHeavyNoise, 2, 900, 700);
-  spec.color = false;
-  spec.noise = 14.0;
-  spec.lidLevel = 200.0;  // clear of 255, where noise would be clipped
-  const Synth::HardPage noisy = Synth::GenerateHardPage(spec);
+  Synth::HardPageRecipe recipe =
+      Synth::MakeHardPageRecipe(Synth::HardKind::kHeavyNoise, 2, 900, 700);
+  recipe.color = false;
+  recipe.noise = 14.0;
+  recipe.lidLevel = 200.0;  // clear of 255, where noise would be clipped
+  const Synth::HardPage noisy = Synth::GenerateHardPage(recipe);
   const PageSurvey survey = SurveyPage(ViewOf(noisy.page));
   EXPECT_NEAR(survey.noise, 14.0, 3.0);
   PreparedPage prepared = PreparePage(ViewOf(noisy.page));
@@ -78,31 +80,31 @@ TEST(PagePrep, MeasuresNoiseAndSmoothsOnlyHeavyNoise) {
   EXPECT_EQ(prepared.view.pixels, prepared.pixels.data());
   // The copy is calmer, the page itself untouched.
   EXPECT_LT(SurveyPage(prepared.view).noise, 0.5 * survey.noise);
-  EXPECT_EQ(noisy.page.pixels, Synth::GenerateHardPage(spec).page.pixels);
+  EXPECT_EQ(noisy.page.pixels, Synth::GenerateHardPage(recipe).page.pixels);
 
-  spec.noise = 2.0;
-  const Synth::HardPage quiet = Synth::GenerateHardPage(spec);
+  recipe.noise = 2.0;
+  const Synth::HardPage quiet = Synth::GenerateHardPage(recipe);
   EXPECT_NEAR(SurveyPage(ViewOf(quiet.page)).noise, 2.0, 1.0);
   EXPECT_TRUE(PreparePage(ViewOf(quiet.page)).steps.empty());
 }
 
 TEST(PagePrep, ColourNoiseCountsThreeTimesAgainstTheModule) {
   // The same gray-level noise: harmless on a gray page, smoothed on a colour one.
-  Synth::HardPageSpec spec = Synth::MakeHardPageSpec(Synth::HardKind::kPlain, 4, 800, 600);
-  spec.noise = 7.0;
-  spec.color = false;
-  EXPECT_TRUE(PreparePage(ViewOf(Synth::GenerateHardPage(spec).page)).steps.empty());
-  spec.color = true;
-  const PreparedPage colour = PreparePage(ViewOf(Synth::GenerateHardPage(spec).page));
+  Synth::HardPageRecipe recipe = Synth::MakeHardPageRecipe(Synth::HardKind::kPlain, 4, 800, 600);
+  recipe.noise = 7.0;
+  recipe.color = false;
+  EXPECT_TRUE(PreparePage(ViewOf(Synth::GenerateHardPage(recipe).page)).steps.empty());
+  recipe.color = true;
+  const PreparedPage colour = PreparePage(ViewOf(Synth::GenerateHardPage(recipe).page));
   ASSERT_EQ(colour.steps.size(), 1u);
   EXPECT_EQ(colour.steps[0].kind, "smooth-noise");
 }
 
 TEST(PagePrep, EstimatesTheLidAndLevelsADarkOne) {
-  Synth::HardPageSpec spec = Synth::MakeHardPageSpec(Synth::HardKind::kGreyLid, 3, 900, 700);
-  spec.lidLevel = 120.0;
-  spec.color = false;
-  const Synth::HardPage hard = Synth::GenerateHardPage(spec);
+  Synth::HardPageRecipe recipe = Synth::MakeHardPageRecipe(Synth::HardKind::kGreyLid, 3, 900, 700);
+  recipe.lidLevel = 120.0;
+  recipe.color = false;
+  const Synth::HardPage hard = Synth::GenerateHardPage(recipe);
   const PageSurvey survey = SurveyPage(ViewOf(hard.page));
   EXPECT_NEAR(survey.lidLevel, 120.0, 4.0);
   EXPECT_LT(survey.lidSpread, 10.0);
@@ -111,15 +113,16 @@ TEST(PagePrep, EstimatesTheLidAndLevelsADarkOne) {
   EXPECT_EQ(prepared.steps[0].kind, "level-lid");
   EXPECT_NEAR(SurveyPage(prepared.view).lidLevel, 245.0, 5.0);
 
-  spec.lidLevel = 200.0;  // grey, but bright enough for the module
-  EXPECT_TRUE(PreparePage(ViewOf(Synth::GenerateHardPage(spec).page)).steps.empty());
+  recipe.lidLevel = 200.0;  // grey, but bright enough for the module
+  EXPECT_TRUE(PreparePage(ViewOf(Synth::GenerateHardPage(recipe).page)).steps.empty());
 }
 
 TEST(PagePrep, LevelsAStronglyUnevenLid) {
-  Synth::HardPageSpec spec = Synth::MakeHardPageSpec(Synth::HardKind::kUnevenLid, 5, 900, 700);
-  spec.lidUnevenness = 0.45;
-  spec.hingeShadow = 0.0;
-  const Synth::HardPage hard = Synth::GenerateHardPage(spec);
+  Synth::HardPageRecipe recipe =
+      Synth::MakeHardPageRecipe(Synth::HardKind::kUnevenLid, 5, 900, 700);
+  recipe.lidUnevenness = 0.45;
+  recipe.hingeShadow = 0.0;
+  const Synth::HardPage hard = Synth::GenerateHardPage(recipe);
   const PageSurvey before = SurveyPage(ViewOf(hard.page));
   ASSERT_TRUE(NeedsLevelling(before.lidLevel, before.lidSpread));
   const PreparedPage prepared = PreparePage(ViewOf(hard.page));

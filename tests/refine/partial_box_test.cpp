@@ -36,7 +36,7 @@ Refine::ModuleAnswer PartOf(const Truth& truth, double from) {
 TEST(PartialModuleBox, GrowsToTheWholeFaintPhoto) {
   for (uint32_t seed = 1; seed <= 3; ++seed) {
     const PageCase c =
-        GeneratedCase(Synth::MakeHardPageSpec(Synth::HardKind::kLowContrast, seed, 1200, 900));
+        GeneratedCase(Synth::MakeHardPageRecipe(Synth::HardKind::kLowContrast, seed, 1200, 900));
     ASSERT_TRUE(c.truth.photo);
     FixedDetector detector(PartOf(c.truth, 0.7));
     const Refine::PipelineResult r = Refine::DetectAndRefine(detector, c.page.View());
@@ -53,7 +53,8 @@ TEST(PartialModuleBox, GrowsToTheWholeFaintPhoto) {
 }
 
 TEST(PartialModuleBox, ABlankPageStaysBlankWhateverTheModuleClaims) {
-  const PageCase c = GeneratedCase(Synth::MakeHardPageSpec(Synth::HardKind::kBlank, 5, 1200, 900));
+  const PageCase c =
+      GeneratedCase(Synth::MakeHardPageRecipe(Synth::HardKind::kBlank, 5, 1200, 900));
   ASSERT_FALSE(c.truth.photo);
   Refine::ModuleAnswer claim;
   claim.corners = {Refine::Vec2{300, 200}, Refine::Vec2{800, 220}, Refine::Vec2{790, 600},

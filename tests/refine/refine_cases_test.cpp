@@ -19,15 +19,15 @@ using Synth::HardKind;
 
 struct Outcome {
   PageCase page;
-  Synth::HardPageSpec spec;
+  Synth::HardPageRecipe recipe;
   Refine::PipelineResult result;
   Score raw, refined;
 };
 
 Outcome RunKind(HardKind kind, uint32_t seed) {
   Outcome o;
-  o.spec = Synth::MakeHardPageSpec(kind, seed, 1200, 900);
-  o.page = GeneratedCase(o.spec);
+  o.recipe = Synth::MakeHardPageRecipe(kind, seed, 1200, 900);
+  o.page = GeneratedCase(o.recipe);
   MemoryDetector detector;
   o.result = Refine::DetectAndRefine(detector, o.page.page.View());
   o.raw = ScoreAnswer(o.page.truth, RawAnswerOf(o.result.raw));
@@ -89,7 +89,7 @@ TEST(RefineCases, WhiteMarginGivesPaperAndPicture) {
     const Outcome o = RunKind(HardKind::kWhiteBorder, seed);
     ExpectFound(o);
     ASSERT_TRUE(o.result.refined.margin) << o.page.name;
-    Synth::HardPage hard = Synth::GenerateHardPage(o.spec);
+    Synth::HardPage hard = Synth::GenerateHardPage(o.recipe);
     for (size_t k = 0; k < 4; ++k) {
       const Refine::Vec2 p = o.result.refined.picture[k];
       EXPECT_NEAR(p.x + 0.5, hard.picture[k][0], 2.0) << o.page.name << " corner " << k;
@@ -99,11 +99,11 @@ TEST(RefineCases, WhiteMarginGivesPaperAndPicture) {
 }
 
 TEST(RefineCases, SheetThatIsNotRectangularIsFollowed) {
-  Synth::HardPageSpec spec = Synth::MakeHardPageSpec(HardKind::kSheared, 4, 1200, 900);
-  spec.shearDegrees = 0.2;
-  spec.paperHeight = 700.0;
-  spec.centerY = 450.0;
-  PageCase c = GeneratedCase(spec);
+  Synth::HardPageRecipe recipe = Synth::MakeHardPageRecipe(HardKind::kSheared, 4, 1200, 900);
+  recipe.shearDegrees = 0.2;
+  recipe.paperHeight = 700.0;
+  recipe.centerY = 450.0;
+  PageCase c = GeneratedCase(recipe);
   MemoryDetector detector;
   const auto result = Refine::DetectAndRefine(detector, c.page.View());
   const Score s = ScoreAnswer(c.truth, RefinedAnswerOf(result.refined));

@@ -48,29 +48,29 @@ struct FaultSet {
   std::string text;
 };
 
-Synth::PageSpec RandomPage(Rng& rng) {
-  Synth::PageSpec spec;
+Synth::PageRecipe RandomPage(Rng& rng) {
+  Synth::PageRecipe recipe;
   // Mostly pages the analysis works through, now and then one too small for it.
   const bool tiny = rng.Chance(5);
-  spec.width = tiny ? rng.Range(1, 30) : rng.Range(27, 360);
-  spec.height = tiny ? rng.Range(1, 30) : rng.Range(27, 360);
-  spec.color = rng.Chance(60);
-  spec.alpha = rng.Chance(15);
-  spec.lidShadow = rng.Chance(20);
-  spec.noise = rng.Range(0, 60) / 10.0;
-  spec.seed = static_cast<uint32_t>(rng.Next());
-  if (spec.width >= 20 && spec.height >= 20 && rng.Chance(85)) {
-    const double w = spec.width, h = spec.height;
-    spec.photo = Synth::PhotoSpec{w * rng.Range(30, 70) / 100.0, h * rng.Range(30, 70) / 100.0,
-                                  w * rng.Range(20, 60) / 100.0, h * rng.Range(20, 60) / 100.0,
-                                  rng.Range(-400, 400) / 10.0};
+  recipe.width = tiny ? rng.Range(1, 30) : rng.Range(27, 360);
+  recipe.height = tiny ? rng.Range(1, 30) : rng.Range(27, 360);
+  recipe.color = rng.Chance(60);
+  recipe.alpha = rng.Chance(15);
+  recipe.lidShadow = rng.Chance(20);
+  recipe.noise = rng.Range(0, 60) / 10.0;
+  recipe.seed = static_cast<uint32_t>(rng.Next());
+  if (recipe.width >= 20 && recipe.height >= 20 && rng.Chance(85)) {
+    const double w = recipe.width, h = recipe.height;
+    recipe.photo = Synth::PhotoRecipe{w * rng.Range(30, 70) / 100.0, h * rng.Range(30, 70) / 100.0,
+                                      w * rng.Range(20, 60) / 100.0, h * rng.Range(20, 60) / 100.0,
+                                      rng.Range(-400, 400) / 10.0};
   }
-  return spec;
+  return recipe;
 }
 
-Standin::Document MakeDocument(const Synth::PageSpec& spec) {
-  Synth::Page page = Synth::GeneratePage(spec);
-  Standin::Document doc(page.width, page.height, spec.color ? 3 : 1, spec.alpha);
+Standin::Document MakeDocument(const Synth::PageRecipe& recipe) {
+  Synth::Page page = Synth::GeneratePage(recipe);
+  Standin::Document doc(page.width, page.height, recipe.color ? 3 : 1, recipe.alpha);
   const auto rowBytes = static_cast<std::ptrdiff_t>(page.width) * page.channels;
   doc.SetPixels(std::move(page.pixels), rowBytes);
   return doc;
@@ -198,15 +198,15 @@ uint64_t RunSeed(uint64_t base, int64_t index) {
 RunOutcome SoakRun(Standin::Module& module, uint64_t seed, Tally& tally) {
   RunOutcome outcome;
   Rng rng(seed);
-  const Synth::PageSpec spec = RandomPage(rng);
-  outcome.what = std::to_string(spec.width) + "x" + std::to_string(spec.height) +
-                 (spec.color ? " rgb" : " gray") + (spec.alpha ? "+alpha" : "") +
-                 (spec.photo ? " photo" : " blank");
+  const Synth::PageRecipe recipe = RandomPage(rng);
+  outcome.what = std::to_string(recipe.width) + "x" + std::to_string(recipe.height) +
+                 (recipe.color ? " rgb" : " gray") + (recipe.alpha ? "+alpha" : "") +
+                 (recipe.photo ? " photo" : " blank");
 
   // The dictionary outlives the host that offers it.
   Standin::KeyStringDictionary dictionary;
   dictionary.Add("$$$/Vireo/Reporter/Title=Error", u"Fehler");
-  Standin::Host host(module, MakeDocument(spec));
+  Standin::Host host(module, MakeDocument(recipe));
   const bool translating = rng.Chance(50);
   if (translating)
     dictionary.OfferThrough(host.Suites(), Standin::TranslationRoute::KeyStringSuites);

@@ -21,12 +21,13 @@ class CliTest : public ::testing::Test {
   std::string WritePageFile(const std::string& name, Layout layout = Layout::Rgb,
                             double angle = 8.0, bool photo = true, int width = 800,
                             int height = 600) {
-    Synth::PageSpec spec = PageWithPhoto(width, height, angle, photo);
-    spec.color = layout != Layout::Gray && layout != Layout::Gray16 && layout != Layout::GrayAlpha;
-    spec.alpha = layout == Layout::RgbAlpha || layout == Layout::GrayAlpha;
-    if (spec.alpha) spec.pageAlpha = 200;
-    last_ = Synth::GeneratePage(spec);
-    lastSpec_ = spec;
+    Synth::PageRecipe recipe = PageWithPhoto(width, height, angle, photo);
+    recipe.color =
+        layout != Layout::Gray && layout != Layout::Gray16 && layout != Layout::GrayAlpha;
+    recipe.alpha = layout == Layout::RgbAlpha || layout == Layout::GrayAlpha;
+    if (recipe.alpha) recipe.pageAlpha = 200;
+    last_ = Synth::GeneratePage(recipe);
+    lastRecipe_ = recipe;
     const std::string path = tmp_ / name;
     std::filesystem::create_directories(std::filesystem::path(path).parent_path());
     WritePage(last_, path, layout);
@@ -61,7 +62,7 @@ class CliTest : public ::testing::Test {
 
   TempFolder tmp_;
   Synth::Page last_;
-  Synth::PageSpec lastSpec_;
+  Synth::PageRecipe lastRecipe_;
 };
 
 }  // namespace FringeTest

@@ -29,8 +29,8 @@ TEST_F(OutputsTest, CropsHaveThePhotosSizeAndHoldOnlyThePhoto) {
     const nlohmann::json line = OnlyLine(r);
     const vips::VImage photo =
         vips::VImage::new_from_file(line["photo"].get<std::string>().c_str());
-    EXPECT_NEAR(photo.width(), lastSpec_.photo->width, 5.0);
-    EXPECT_NEAR(photo.height(), lastSpec_.photo->height, 5.0);
+    EXPECT_NEAR(photo.width(), lastRecipe_.photo->width, 5.0);
+    EXPECT_NEAR(photo.height(), lastRecipe_.photo->height, 5.0);
     // The paper is near white and the photo's samples stay below 171: an edge
     // of paper (a crop turned the wrong way or misplaced) would lift the mean.
     EXPECT_LT(BorderMean(photo), 150.0);

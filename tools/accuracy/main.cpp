@@ -40,12 +40,12 @@ struct Settings {
   bool byKind = false;
   bool perPage = false;
   std::string jsonFile;
-  std::string inspect;             // page name, to print its sides' profiles
-  std::vector<std::string> specs;  // single pages: kind,seed,width,height
+  std::string inspect;               // page name, to print its sides' profiles
+  std::vector<std::string> recipes;  // single pages: kind,seed,width,height
 };
 
 // kind,seed,width,height: one page of the set's kind, as the tests make them.
-Synth::HardPageSpec ParseSpec(const std::string& text) {
+Synth::HardPageRecipe ParseRecipe(const std::string& text) {
   std::stringstream in(text);
   std::string kind, seed, width, height;
   std::getline(in, kind, ',');
@@ -54,16 +54,16 @@ Synth::HardPageSpec ParseSpec(const std::string& text) {
   std::getline(in, height, ',');
   const auto k = Synth::HardKindFromName(kind);
   if (!k || seed.empty() || width.empty() || height.empty())
-    throw CLI::ValidationError("--spec", "expected kind,seed,width,height, not \"" + text + "\"");
+    throw CLI::ValidationError("--recipe", "expected kind,seed,width,height, not \"" + text + "\"");
   try {
-    return Synth::MakeHardPageSpec(*k, static_cast<uint32_t>(std::stoul(seed)), std::stoi(width),
-                                   std::stoi(height));
+    return Synth::MakeHardPageRecipe(*k, static_cast<uint32_t>(std::stoul(seed)), std::stoi(width),
+                                     std::stoi(height));
   } catch (const std::logic_error&) {
-    throw CLI::ValidationError("--spec", "expected numbers in \"" + text + "\"");
+    throw CLI::ValidationError("--recipe", "expected numbers in \"" + text + "\"");
   }
 }
 
-std::vector<Synth::HardPageSpec> SelectSpecs(const Settings& s) {
+std::vector<Synth::HardPageRecipe> SelectRecipes(const Settings& s) {
   std::set<Synth::HardKind> wanted;
   std::stringstream list(s.kinds);
   for (std::string name; std::getline(list, name, ',');) {
@@ -72,17 +72,17 @@ std::vector<Synth::HardPageSpec> SelectSpecs(const Settings& s) {
     if (!kind) throw CLI::ValidationError("--kinds", "unknown kind \"" + name + "\"");
     wanted.insert(*kind);
   }
-  std::vector<Synth::HardPageSpec> specs;
+  std::vector<Synth::HardPageRecipe> recipes;
   // Walk the cycling set until enough pages of the wanted kinds are chosen.
   const int kinds = static_cast<int>(Synth::HardKind::kCount);
   const int span =
       wanted.empty() ? s.generate : s.generate * kinds / static_cast<int>(wanted.size()) + kinds;
-  for (const auto& spec : Synth::HardPageSet(span, s.seed)) {
-    if (!wanted.empty() && !wanted.count(spec.kind)) continue;
-    if (static_cast<int>(specs.size()) == s.generate) break;
-    specs.push_back(spec);
+  for (const auto& recipe : Synth::HardPageSet(span, s.seed)) {
+    if (!wanted.empty() && !wanted.count(recipe.kind)) continue;
+    if (static_cast<int>(recipes.size()) == s.generate) break;
+    recipes.push_back(recipe);
   }
-  return specs;
+  return recipes;
 }
 
 nlohmann::ordered_json ScoreJson(const Accuracy::Score& s) {
@@ -160,14 +160,15 @@ int Run(const Settings& s) {
     for (const auto& file : files) score(Accuracy::FolderCase(file));
     source = std::to_string(files.size()) + " pages from " + s.pages;
   } else {
-    auto specs = SelectSpecs(s);
-    for (const std::string& text : s.specs) specs.push_back(ParseSpec(text));
-    for (const auto& spec : specs) {
-      const Accuracy::PageCase c = Accuracy::GeneratedCase(spec);
+    auto recipes = SelectRecipes(s);
+    for (const std::string& text : s.recipes) recipes.push_back(ParseRecipe(text));
+    for (const auto& recipe : recipes) {
+      const Accuracy::PageCase c = Accuracy::GeneratedCase(recipe);
       if (!s.write.empty()) Accuracy::WriteCase(c, s.write);
       score(c);
     }
-    source = std::to_string(specs.size()) + " generated hard pages, seed " + std::to_string(s.seed);
+    source =
+        std::to_string(recipes.size()) + " generated hard pages, seed " + std::to_string(s.seed);
   }
 
   std::printf("Accuracy on %s (%s)\n\n%s", source.c_str(),
@@ -215,14 +216,14 @@ int main(int argc, char** argv) {
   app.add_flag("--by-kind", s.byKind, "Add a table kind by kind");
   app.add_flag("--per-page", s.perPage, "A line per page on standard error");
   app.add_option("--json", s.jsonFile, "Write one JSON object per page to this file");
-  app.add_option("--spec", s.specs,
+  app.add_option("--recipe", s.recipes,
                  "Also score this page of the set: kind,seed,width,height (diagnostics)")
       ->excludes(pages);
   app.add_option("--inspect", s.inspect,
                  "Print the profiles across each side of the named page (diagnostics)");
   try {
     app.parse(argc, argv);
-    if (s.generate == 0 && s.pages.empty() && s.specs.empty())
+    if (s.generate == 0 && s.pages.empty() && s.recipes.empty())
       throw CLI::RequiredError("--generate or --pages");
   } catch (const CLI::ParseError& e) {
     const int code = app.exit(e);

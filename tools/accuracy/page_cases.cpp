@@ -8,21 +8,21 @@
 
 namespace Accuracy {
 
-PageCase GeneratedCase(const Synth::HardPageSpec& spec) {
-  const Synth::HardPage hard = Synth::GenerateHardPage(spec);
+PageCase GeneratedCase(const Synth::HardPageRecipe& recipe) {
+  const Synth::HardPage hard = Synth::GenerateHardPage(recipe);
   PageCase c;
-  c.name = std::string(Synth::HardKindName(spec.kind)) + "-" + std::to_string(spec.seed);
+  c.name = std::string(Synth::HardKindName(recipe.kind)) + "-" + std::to_string(recipe.seed);
   c.truth.photo = hard.hasPhoto;
-  c.truth.kind = std::string(Synth::HardKindName(spec.kind));
+  c.truth.kind = std::string(Synth::HardKindName(recipe.kind));
   if (hard.hasPhoto) {
     for (size_t k = 0; k < 4; ++k) c.truth.corners[k] = {hard.paper[k][0], hard.paper[k][1]};
-    c.truth.angle = spec.angleDegrees;
+    c.truth.angle = recipe.angleDegrees;
   }
   c.page = PageBuffer{hard.page.width, hard.page.height, hard.page.channels, hard.page.pixels};
-  c.jpegQuality = spec.jpegQuality;
-  if (spec.jpegQuality > 0) {
+  c.jpegQuality = recipe.jpegQuality;
+  if (recipe.jpegQuality > 0) {
     c.unencoded = c.page;
-    c.page = JpegRoundTrip(c.unencoded, spec.jpegQuality);
+    c.page = JpegRoundTrip(c.unencoded, recipe.jpegQuality);
   }
   return c;
 }

@@ -21,9 +21,9 @@ struct PageCase {
   PageBuffer unencoded;  // a JPEG page before encoding: what gets written
 };
 
-// The page and its truth for one generated spec; JPEG pages come back after
+// The page and its truth for one generated recipe; JPEG pages come back after
 // a round trip through the encoder.
-PageCase GeneratedCase(const Synth::HardPageSpec& spec);
+PageCase GeneratedCase(const Synth::HardPageRecipe& recipe);
 
 // Image files under the folder (not recursive) that have a truth file, by name.
 std::vector<std::string> PagesWithTruth(const std::string& folder);

@@ -138,19 +138,19 @@ int RunSingle(const Runner::Options& options, Standin::Module& module) {
 }
 
 std::vector<Runner::PageResult> RunPages(Standin::Module& module,
-                                         const std::vector<Synth::PageSpec>& specs) {
+                                         const std::vector<Synth::PageRecipe>& recipes) {
   std::vector<Runner::PageResult> results;
-  for (const Synth::PageSpec& spec : specs) {
-    Synth::Page page = Synth::GeneratePage(spec);
+  for (const Synth::PageRecipe& recipe : recipes) {
+    Synth::Page page = Synth::GeneratePage(recipe);
     Standin::PageView view{
-        page.width, page.height,        spec.color ? 3 : 1,
-        spec.alpha, page.pixels.data(), static_cast<std::ptrdiff_t>(page.width) * page.channels};
+        page.width,   page.height,        recipe.color ? 3 : 1,
+        recipe.alpha, page.pixels.data(), static_cast<std::ptrdiff_t>(page.width) * page.channels};
     results.push_back(Runner::ResultOf(page, Standin::Detect(module, view)));
   }
   return results;
 }
 
-std::vector<Synth::PageSpec> PagesOf(const std::string& header) {
+std::vector<Synth::PageRecipe> PagesOf(const std::string& header) {
   if (header == "golden") return Runner::GoldenPages();
   int count = 0;
   unsigned long long seed = 0;
@@ -181,12 +181,12 @@ int Compare(const Runner::Options& options, Standin::Module& module) {
   if (!in) throw Standin::Error("cannot read '" + options.resultsFile + "'");
   std::string header;
   std::vector<Runner::PageResult> theirs = Runner::ReadResults(in, &header);
-  std::vector<Synth::PageSpec> specs = PagesOf(header);
-  if (theirs.size() != specs.size()) {
+  std::vector<Synth::PageRecipe> recipes = PagesOf(header);
+  if (theirs.size() != recipes.size()) {
     throw Standin::Error("'" + options.resultsFile + "' holds " + std::to_string(theirs.size()) +
-                         " results for " + std::to_string(specs.size()) + " pages");
+                         " results for " + std::to_string(recipes.size()) + " pages");
   }
-  std::vector<Runner::PageResult> ours = RunPages(module, specs);
+  std::vector<Runner::PageResult> ours = RunPages(module, recipes);
   int differing = 0, generatorDiffers = 0, failed = 0;
   for (size_t i = 0; i < ours.size(); ++i) {
     failed += ours[i].failed || theirs[i].failed ? 1 : 0;

@@ -12,15 +12,15 @@ namespace Runner {
 
 namespace {
 
-Synth::PageSpec Page(int width, int height, bool color, double cx, double cy, double w, double h,
-                     double angle, uint32_t seed) {
-  Synth::PageSpec spec;
-  spec.width = width;
-  spec.height = height;
-  spec.color = color;
-  spec.photo = Synth::PhotoSpec{cx, cy, w, h, angle};
-  spec.seed = seed;
-  return spec;
+Synth::PageRecipe Page(int width, int height, bool color, double cx, double cy, double w, double h,
+                       double angle, uint32_t seed) {
+  Synth::PageRecipe recipe;
+  recipe.width = width;
+  recipe.height = height;
+  recipe.color = color;
+  recipe.photo = Synth::PhotoRecipe{cx, cy, w, h, angle};
+  recipe.seed = seed;
+  return recipe;
 }
 
 // splitmix64: a small generator whose every step is integer arithmetic.
@@ -54,8 +54,8 @@ std::string Hex(uint64_t value) {
 
 }  // namespace
 
-std::vector<Synth::PageSpec> GoldenPages() {
-  std::vector<Synth::PageSpec> pages = {
+std::vector<Synth::PageRecipe> GoldenPages() {
+  std::vector<Synth::PageRecipe> pages = {
       Page(1200, 900, true, 600, 450, 700, 500, 7.0, 11),
       Page(1200, 900, false, 520, 470, 640, 420, -12.5, 12),
       Page(1000, 800, true, 480, 390, 500, 350, 0.0, 13),
@@ -66,42 +66,42 @@ std::vector<Synth::PageSpec> GoldenPages() {
       Page(320, 240, true, 160, 120, 180, 120, 15.0, 18),
       Page(2000, 1500, true, 1000, 760, 1200, 820, -8.0, 19),
   };
-  Synth::PageSpec blank;
+  Synth::PageRecipe blank;
   blank.width = 800;
   blank.height = 600;
   blank.seed = 20;
   pages.push_back(blank);
-  Synth::PageSpec alpha = Page(1200, 900, true, 610, 440, 680, 480, 3.0, 21);
+  Synth::PageRecipe alpha = Page(1200, 900, true, 610, 440, 680, 480, 3.0, 21);
   alpha.alpha = true;
   pages.push_back(alpha);
-  Synth::PageSpec shadow = Page(1000, 800, true, 500, 420, 560, 380, -4.0, 22);
+  Synth::PageRecipe shadow = Page(1000, 800, true, 500, 420, 560, 380, -4.0, 22);
   shadow.lidShadow = true;
   pages.push_back(shadow);
   return pages;
 }
 
-std::vector<Synth::PageSpec> SweepPages(int count, uint64_t seed) {
+std::vector<Synth::PageRecipe> SweepPages(int count, uint64_t seed) {
   Draw draw(seed);
-  std::vector<Synth::PageSpec> pages;
+  std::vector<Synth::PageRecipe> pages;
   for (int i = 0; i < count; ++i) {
-    Synth::PageSpec spec;
-    spec.width = draw.Between(300, 2400);
-    spec.height = draw.Between(300, 2400);
-    spec.color = draw.Chance(50);
-    spec.alpha = draw.Chance(10);
-    spec.lidShadow = draw.Chance(20);
-    spec.noise = draw.Between(0.5, 4.0);
-    spec.seed = static_cast<uint32_t>(draw.Next());
+    Synth::PageRecipe recipe;
+    recipe.width = draw.Between(300, 2400);
+    recipe.height = draw.Between(300, 2400);
+    recipe.color = draw.Chance(50);
+    recipe.alpha = draw.Chance(10);
+    recipe.lidShadow = draw.Chance(20);
+    recipe.noise = draw.Between(0.5, 4.0);
+    recipe.seed = static_cast<uint32_t>(draw.Next());
     if (draw.Chance(92)) {
-      Synth::PhotoSpec photo;
-      photo.width = spec.width * draw.Between(0.25, 0.8);
-      photo.height = spec.height * draw.Between(0.25, 0.8);
-      photo.centerX = spec.width * draw.Between(0.3, 0.7);
-      photo.centerY = spec.height * draw.Between(0.3, 0.7);
+      Synth::PhotoRecipe photo;
+      photo.width = recipe.width * draw.Between(0.25, 0.8);
+      photo.height = recipe.height * draw.Between(0.25, 0.8);
+      photo.centerX = recipe.width * draw.Between(0.3, 0.7);
+      photo.centerY = recipe.height * draw.Between(0.3, 0.7);
       photo.angleDegrees = draw.Between(-40.0, 40.0);
-      spec.photo = photo;
+      recipe.photo = photo;
     }
-    pages.push_back(spec);
+    pages.push_back(recipe);
   }
   return pages;
 }

@@ -1,5 +1,5 @@
 // Sets of synthetic pages that both builds of the module can run identically:
-// a fixed golden set and a seeded sweep, each page named by its spec. Results
+// a fixed golden set and a seeded sweep, each page named by its recipe. Results
 // go to a text file that the other platform's runner can compare with its own.
 #pragma once
 
@@ -13,10 +13,10 @@
 
 namespace Runner {
 
-std::vector<Synth::PageSpec> GoldenPages();
+std::vector<Synth::PageRecipe> GoldenPages();
 // `count` pages drawn from `seed` with integer arithmetic only, so that every
 // platform draws the same pages.
-std::vector<Synth::PageSpec> SweepPages(int count, uint64_t seed);
+std::vector<Synth::PageRecipe> SweepPages(int count, uint64_t seed);
 
 // What one page gave, in the form compared across platforms.
 struct PageResult {

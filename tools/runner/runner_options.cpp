@@ -79,9 +79,9 @@ page sets (for comparing two builds of the module)
 
 Options ParseOptions(int argc, char** argv) {
   Options options;
-  options.page.photo = Synth::PhotoSpec{1000, 760, 1200, 820, 7.0};
+  options.page.photo = Synth::PhotoRecipe{1000, 760, 1200, 820, 7.0};
   bool blank = false;
-  std::optional<Synth::PhotoSpec> photo;
+  std::optional<Synth::PhotoRecipe> photo;
   for (int i = 1; i < argc; ++i) {
     std::string option = argv[i];
     auto value = [&]() -> std::string {
@@ -122,7 +122,7 @@ Options ParseOptions(int argc, char** argv) {
       options.rawFile = value();
     } else if (option == "--photo") {
       std::vector<double> p = Numbers(option, value(), 5, ',');
-      photo = Synth::PhotoSpec{p[0], p[1], p[2], p[3], p[4]};
+      photo = Synth::PhotoRecipe{p[0], p[1], p[2], p[3], p[4]};
     } else if (option == "--blank") {
       blank = true;
     } else if (option == "--seed") {
@@ -160,8 +160,8 @@ Options ParseOptions(int argc, char** argv) {
     options.page.photo = photo;
   } else if (options.width != 2000 || options.height != 1500) {
     // The default photo scaled to the chosen size.
-    options.page.photo = Synth::PhotoSpec{options.width * 0.5, options.height * 0.5067,
-                                          options.width * 0.6, options.height * 0.5467, 7.0};
+    options.page.photo = Synth::PhotoRecipe{options.width * 0.5, options.height * 0.5067,
+                                            options.width * 0.6, options.height * 0.5467, 7.0};
   }
   options.page.width = options.width;
   options.page.height = options.height;

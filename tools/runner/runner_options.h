@@ -25,8 +25,8 @@ struct Options {
   std::optional<std::array<int32_t, 4>> rect;
   std::optional<int16_t> filterCase;
   int32_t budget = 1 << 30;
-  std::string rawFile;   // pixels from a file instead of a synthetic page
-  Synth::PageSpec page;  // photo, seed, noise, lid shadow (size and colour from above)
+  std::string rawFile;     // pixels from a file instead of a synthetic page
+  Synth::PageRecipe page;  // photo, seed, noise, lid shadow (size and colour from above)
   int32_t cancelAt = 0;
   int continues = 1;
   int32_t rowPadding = 0;

@@ -25,12 +25,12 @@ int main(int argc, char** argv) {
     std::filesystem::create_directories(dir);
     for (int i = 0; i < count; ++i) {
       const double angle = -30.0 + 60.0 * ((i * 37) % 101) / 100.0;
-      Synth::PageSpec spec = FringeTest::PageWithPhoto(width, height, angle, i % 10 != 9,
-                                                       static_cast<uint32_t>(i + 1));
-      spec.lidShadow = i % 3 == 0;
+      Synth::PageRecipe recipe = FringeTest::PageWithPhoto(width, height, angle, i % 10 != 9,
+                                                           static_cast<uint32_t>(i + 1));
+      recipe.lidShadow = i % 3 == 0;
       char name[32];
       std::snprintf(name, sizeof name, "/page%04d.jpg", i);
-      FringeTest::ImageOf(Synth::GeneratePage(spec))
+      FringeTest::ImageOf(Synth::GeneratePage(recipe))
           .jpegsave((dir + name).c_str(), vips::VImage::option()->set("Q", 90));
     }
   } catch (const std::exception& e) {

@@ -11,14 +11,14 @@ int main(int argc, char** argv) {
     return 64;
   }
   try {
-    Synth::PageSpec spec;
-    spec.width = 1200;
-    spec.height = 900;
-    spec.photo = Synth::PhotoSpec{585.0, 430.0, 640.0, 440.0, 6.5};
-    spec.lidShadow = true;
-    spec.noise = 2.5;
-    spec.seed = 2024;
-    const Synth::Page page = Synth::GeneratePage(spec);
+    Synth::PageRecipe recipe;
+    recipe.width = 1200;
+    recipe.height = 900;
+    recipe.photo = Synth::PhotoRecipe{585.0, 430.0, 640.0, 440.0, 6.5};
+    recipe.lidShadow = true;
+    recipe.noise = 2.5;
+    recipe.seed = 2024;
+    const Synth::Page page = Synth::GeneratePage(recipe);
     FringeTest::ImageOf(page).jpegsave(argv[1], vips::VImage::option()->set("Q", 88));
     for (const auto& c : page.corners) std::printf("(%.2f, %.2f) ", c[0], c[1]);
     std::printf("\n");

@@ -36,15 +36,16 @@ const char* LayoutName(Layout layout) {
   return "?";
 }
 
-Synth::PageSpec PageWithPhoto(int width, int height, double angle, bool photo, uint32_t seed) {
-  Synth::PageSpec spec;
-  spec.width = width;
-  spec.height = height;
-  spec.seed = seed;
+Synth::PageRecipe PageWithPhoto(int width, int height, double angle, bool photo, uint32_t seed) {
+  Synth::PageRecipe recipe;
+  recipe.width = width;
+  recipe.height = height;
+  recipe.seed = seed;
   if (photo) {
-    spec.photo = Synth::PhotoSpec{width * 0.52, height * 0.47, width * 0.5, height * 0.46, angle};
+    recipe.photo =
+        Synth::PhotoRecipe{width * 0.52, height * 0.47, width * 0.5, height * 0.46, angle};
   }
-  return spec;
+  return recipe;
 }
 
 vips::VImage ImageOf(const Synth::Page& page) {

@@ -17,8 +17,8 @@ const char* LayoutName(Layout layout);
 
 // A page of the given size with a photo centred near the middle, turned by
 // angle degrees, about half the page across; photo = false leaves the page bare.
-Synth::PageSpec PageWithPhoto(int width, int height, double angle, bool photo = true,
-                              uint32_t seed = 3);
+Synth::PageRecipe PageWithPhoto(int width, int height, double angle, bool photo = true,
+                                uint32_t seed = 3);
 
 // The generated pixels as an image (8-bit, interleaved, in memory).
 vips::VImage ImageOf(const Synth::Page& page);
