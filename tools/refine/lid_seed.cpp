@@ -38,6 +38,19 @@ double DepartureThreshold(const LidEstimate& lid, int size) {
   return std::max(3.0, 4.0 * lid.noise / size + 3.0 * lid.residual);
 }
 
+// Mean gray of the size x size pixels from (x0, y0), from a whole-number sum
+// of their colour bytes.
+double BlockMean(const PageImage& page, int32_t x0, int32_t y0, int size) {
+  uint32_t sum = 0;
+  for (int32_t y = y0; y < y0 + size; ++y) {
+    const uint8_t* pixel = page.pixels + static_cast<std::ptrdiff_t>(y) * page.rowBytes +
+                           static_cast<std::ptrdiff_t>(x0) * page.pixelBytes;
+    for (int i = 0; i < size; ++i, pixel += page.pixelBytes)
+      for (int ch = 0; ch < page.channels; ++ch) sum += pixel[ch];
+  }
+  return sum * (1.0 / (static_cast<double>(size) * size * page.channels));
+}
+
 BlockGrid MarkDepartures(const PageImage& page, const LidEstimate& lid, const SampleArea& area) {
   BlockGrid grid;
   const double spanX = area.right - area.left + 1.0;
@@ -51,58 +64,42 @@ BlockGrid MarkDepartures(const PageImage& page, const LidEstimate& lid, const Sa
   grid.cells.assign(static_cast<size_t>(grid.columns) * static_cast<size_t>(grid.rows), 0);
 
   const double threshold = DepartureThreshold(lid, grid.size);
-  // Whole-number sums of the colour bytes, a block row at a time.
-  std::vector<uint32_t> sums(static_cast<size_t>(grid.columns));
-  const double scale = 1.0 / (static_cast<double>(grid.size) * grid.size * page.channels);
   for (int r = 0; r < grid.rows; ++r) {
     const auto y0 = static_cast<int32_t>(grid.top) + r * grid.size;
-    std::fill(sums.begin(), sums.end(), 0u);
-    for (int32_t y = y0; y < y0 + grid.size; ++y) {
-      const uint8_t* row = page.pixels + static_cast<std::ptrdiff_t>(y) * page.rowBytes +
-                           static_cast<std::ptrdiff_t>(grid.left) * page.pixelBytes;
-      for (int c = 0; c < grid.columns; ++c) {
-        uint32_t sum = 0;
-        for (int i = 0; i < grid.size; ++i, row += page.pixelBytes)
-          for (int ch = 0; ch < page.channels; ++ch) sum += row[ch];
-        sums[static_cast<size_t>(c)] += sum;
-      }
-    }
     const double v = (y0 + 0.5 * grid.size) / page.height;
     for (int c = 0; c < grid.columns; ++c) {
-      const double u = (grid.left + (c + 0.5) * grid.size) / page.width;
-      if (std::abs(sums[static_cast<size_t>(c)] * scale - LidAt(lid, u, v)) > threshold)
+      const auto x0 = static_cast<int32_t>(grid.left) + c * grid.size;
+      const double u = (x0 + 0.5 * grid.size) / page.width;
+      if (std::abs(BlockMean(page, x0, y0, grid.size) - LidAt(lid, u, v)) > threshold)
         grid.At(c, r) = 1;
     }
   }
   return grid;
 }
 
-// Closes gaps of one block (a photo's lid-coloured patches), then opens
-// nothing: the region only needs to hold together.
+// Sets every cell that has a `value` among its 3 x 3 neighbours inside the
+// grid to `value`. Cells beyond the grid never count: for growing they are
+// unmarked, for shrinking marked, so regions at the area's edge keep their extent.
+void Spread(BlockGrid& grid, uint8_t value) {
+  const BlockGrid before = grid;
+  for (int r = 0; r < grid.rows; ++r)
+    for (int c = 0; c < grid.columns; ++c) {
+      bool near = false;
+      for (int dr = -1; dr <= 1 && !near; ++dr)
+        for (int dc = -1; dc <= 1 && !near; ++dc) {
+          const int cc = c + dc, rr = r + dr;
+          near = cc >= 0 && rr >= 0 && cc < grid.columns && rr < grid.rows &&
+                 before.At(cc, rr) == value;
+        }
+      if (near) grid.At(c, r) = value;
+    }
+}
+
+// Closes gaps of one block (a photo's lid-coloured patches): grows the marked
+// cells by one, then shrinks them back.
 void CloseGaps(BlockGrid& grid) {
-  const BlockGrid marked = grid;
-  for (int r = 0; r < grid.rows; ++r)
-    for (int c = 0; c < grid.columns; ++c) {
-      uint8_t any = 0;
-      for (int dr = -1; dr <= 1 && !any; ++dr)
-        for (int dc = -1; dc <= 1 && !any; ++dc) {
-          const int cc = c + dc, rr = r + dr;
-          if (cc >= 0 && rr >= 0 && cc < grid.columns && rr < grid.rows) any = marked.At(cc, rr);
-        }
-      grid.At(c, r) = any;
-    }
-  const BlockGrid dilated = grid;
-  for (int r = 0; r < grid.rows; ++r)
-    for (int c = 0; c < grid.columns; ++c) {
-      uint8_t all = 1;
-      for (int dr = -1; dr <= 1 && all; ++dr)
-        for (int dc = -1; dc <= 1 && all; ++dc) {
-          const int cc = c + dc, rr = r + dr;
-          // Beyond the grid counts as marked, so regions at the area's edge keep their extent.
-          if (cc >= 0 && rr >= 0 && cc < grid.columns && rr < grid.rows) all = dilated.At(cc, rr);
-        }
-      grid.At(c, r) = all;
-    }
+  Spread(grid, 1);
+  Spread(grid, 0);
 }
 
 // The cells of the largest 8-connected region, labelled 2 in the grid.
@@ -197,7 +194,6 @@ std::optional<Quad> MinimumAreaRectangle(std::vector<Vec2> points) {
 bool DepartsOutside(const PageImage& page, const LidEstimate& lid, const SampleArea& area,
                     const Quad& outline) {
   if (!CheckPageImage(page).empty() || !(lid.level > 0.0)) return false;
-  const GraySampler sampler(page);
   constexpr int kSize = 4;  // means of 4 x 4 pixels
   constexpr int kPoints = 16;
   const double threshold = DepartureThreshold(lid, kSize);
@@ -216,12 +212,9 @@ bool DepartsOutside(const PageImage& page, const LidEstimate& lid, const SampleA
       if (!(left >= area.left && top >= area.top && left + kSize - 1 <= area.right &&
             top + kSize - 1 <= area.bottom))
         continue;
-      double sum = 0.0;
-      for (int y = 0; y < kSize; ++y)
-        for (int x = 0; x < kSize; ++x)
-          sum += sampler.Pixel(static_cast<int32_t>(left) + x, static_cast<int32_t>(top) + y);
       ++seen;
-      const double mean = sum / (kSize * kSize);
+      const double mean =
+          BlockMean(page, static_cast<int32_t>(left), static_cast<int32_t>(top), kSize);
       if (std::abs(mean - LidAt(lid, p.x / page.width, p.y / page.height)) > threshold) ++departing;
     }
     if (seen >= kPoints / 2 && 2 * departing > seen) return true;

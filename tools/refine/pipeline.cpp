@@ -35,9 +35,9 @@ std::optional<Refinement> RefineFromLidSeed(const PageImage& page, const ModuleA
                                             const RefineOptions& options,
                                             const Refinement& current) {
   const bool complete = Rank(current) >= 3;
-  const LidEstimate lid = options.lid ? *options.lid : EstimateLid(page);
-  const SampleArea area = options.area.value_or(SampleArea{
-      0.0, 0.0, static_cast<double>(page.width - 1), static_cast<double>(page.height - 1)});
+  // The caller measured the lid once for every refinement of the page.
+  const LidEstimate& lid = *options.lid;
+  const SampleArea area = AreaToRead(page, options);
   // A complete outline is looked at again only when the page just outside it
   // is not lid; cheap to ask first, as the seed reads the whole page.
   if (complete && !DepartsOutside(page, lid, area, current.outline)) return std::nullopt;
@@ -112,6 +112,9 @@ PipelineResult RefineDetection(Detector& detector, const PageImage& page, const 
   if (!options.refine) {
     result.refined = Unrefined(chosen, "refinement switched off");
   } else {
+    // Measured once here, when there is a photo to refine: each refinement
+    // below and the lid seed read it.
+    if (!refineOptions.lid && chosen.FoundPhoto()) refineOptions.lid = EstimateLid(page);
     result.refined = RefineOutline(page, chosen, refineOptions);
     // The module's first answer may still serve better than the prepared one.
     if (result.prepared && result.raw.FoundPhoto() && Rank(result.refined) < 2) {

@@ -265,6 +265,11 @@ Refinement Unrefined(const ModuleAnswer& answer, std::string reason) {
   return out;
 }
 
+SampleArea AreaToRead(const PageImage& page, const RefineOptions& options) {
+  return options.area.value_or(SampleArea{0.0, 0.0, static_cast<double>(page.width - 1),
+                                          static_cast<double>(page.height - 1)});
+}
+
 Refinement RefineOutline(const PageImage& page, const ModuleAnswer& answer,
                          const RefineOptions& options) {
   Refinement out = Unrefined(answer, "");
@@ -284,8 +289,7 @@ Refinement RefineOutline(const PageImage& page, const ModuleAnswer& answer,
     return out;
   }
 
-  const SampleArea area = options.area.value_or(SampleArea{
-      0.0, 0.0, static_cast<double>(page.width - 1), static_cast<double>(page.height - 1)});
+  const SampleArea area = AreaToRead(page, options);
   const GraySampler sampler(page);
   const double across = std::min(Distance(answer.corners[0], answer.corners[1]),
                                  Distance(answer.corners[1], answer.corners[2]));

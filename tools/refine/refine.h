@@ -88,6 +88,9 @@ struct RefineOptions {
 Refinement RefineOutline(const PageImage& page, const ModuleAnswer& answer,
                          const RefineOptions& options = {});
 
+// The part of the page refinement reads: the options' area, else the whole page.
+SampleArea AreaToRead(const PageImage& page, const RefineOptions& options);
+
 // The module's answer passed on as it is (kKept, or kNoPhoto when it found none).
 Refinement Unrefined(const ModuleAnswer& answer, std::string reason);
 
